@@ -1,0 +1,2 @@
+# Fuzz targets of the foundation library.
+wbt_add_fuzzer(fuzz_utf8 SOURCES ${CMAKE_CURRENT_LIST_DIR}/kern/Utf8Fuzz.cpp DEPS wbt::kern)
