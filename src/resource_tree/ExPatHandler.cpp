@@ -1,0 +1,156 @@
+// The adapter between Expat and wide-string event handlers.
+#include "resource_tree/ExPatHandler.h"
+
+#include <unicode/ustring.h>
+
+#include <cstring>
+#include <new>
+
+namespace wbhw {
+
+void AppendUtf8AsUtf16(std::string_view utf8, std::u16string& out) {
+    // Markup is nearly all ASCII; widen that directly and leave the rest to ICU, which also turns
+    // four-byte sequences into surrogate pairs.
+    size_t ascii = 0;
+    while (ascii < utf8.size() && static_cast<unsigned char>(utf8[ascii]) < 0x80u)
+        ++ascii;
+    const size_t base = out.size();
+    out.resize(base + utf8.size());
+    for (size_t i = 0; i < ascii; ++i)
+        out[base + i] = static_cast<char16_t>(utf8[i]);
+    if (ascii == utf8.size())
+        return;
+    int32_t written = 0;
+    UErrorCode status = U_ZERO_ERROR;
+    u_strFromUTF8WithSub(out.data() + base + ascii, static_cast<int32_t>(utf8.size() - ascii),
+                         &written, utf8.data() + ascii, static_cast<int32_t>(utf8.size() - ascii),
+                         0xFFFD, nullptr, &status);
+    out.resize(base + ascii + (U_SUCCESS(status) ? static_cast<size_t>(written) : 0));
+}
+
+ExPatHandler::ExPatHandler() : parser_(XML_ParserCreate("UTF-8")) {
+    if (!parser_)
+        throw std::bad_alloc();
+    XML_Parser p = parser_.get();
+    XML_SetUserData(p, this);
+    XML_SetElementHandler(p, &OnStart, &OnEnd);
+    XML_SetCharacterDataHandler(p, &OnText);
+    XML_SetProcessingInstructionHandler(p, &OnPi);
+    XML_SetCommentHandler(p, &OnComment);
+    XML_SetCdataSectionHandler(p, &OnCdataStart, &OnCdataEnd);
+}
+
+ExPatHandler::~ExPatHandler() = default;
+
+template <class Fn> void ExPatHandler::Guarded(Fn&& call) noexcept {
+    if (pending_)
+        return;
+    try {
+        call();
+    } catch (...) {
+        pending_ = std::current_exception();
+        XML_StopParser(parser_.get(), XML_FALSE);
+    }
+}
+
+bool ExPatHandler::Parse(std::string_view utf8, bool isFinal) {
+    const XML_Status status =
+        XML_Parse(parser_.get(), utf8.data(), static_cast<int>(utf8.size()), isFinal ? 1 : 0);
+    if (pending_) {
+        std::exception_ptr thrown = nullptr;
+        std::swap(thrown, pending_);
+        std::rethrow_exception(thrown);
+    }
+    return status != XML_STATUS_ERROR;
+}
+
+XML_Error ExPatHandler::ErrorCode() const noexcept { return XML_GetErrorCode(parser_.get()); }
+
+std::string ExPatHandler::ErrorString() const {
+    const XML_LChar* text = XML_ErrorString(ErrorCode());
+    return text != nullptr ? std::string(text) : std::string();
+}
+
+unsigned long ExPatHandler::CurrentLine() const noexcept {
+    return XML_GetCurrentLineNumber(parser_.get());
+}
+
+unsigned long ExPatHandler::CurrentColumn() const noexcept {
+    return XML_GetCurrentColumnNumber(parser_.get());
+}
+
+std::string_view ExPatHandler::InputContext(int& offset) const noexcept {
+    int size = 0;
+    offset = 0;
+    const char* context = XML_GetInputContext(parser_.get(), &offset, &size);
+    if (context == nullptr || size <= 0)
+        return {};
+    return {context, static_cast<size_t>(size)};
+}
+
+void XMLCALL ExPatHandler::OnStart(void* self, const XML_Char* name, const XML_Char** atts) {
+    auto* h = static_cast<ExPatHandler*>(self);
+    h->Guarded([&] {
+        h->name_.clear();
+        AppendUtf8AsUtf16(name, h->name_);
+        h->attributes_.clear();
+        for (const XML_Char** a = atts; a[0] != nullptr; a += 2) {
+            std::u16string key;
+            std::u16string value;
+            AppendUtf8AsUtf16(a[0], key);
+            AppendUtf8AsUtf16(a[1], value);
+            h->attributes_.Insert(std::move(key), std::move(value));
+        }
+        h->StartElement(h->name_, h->attributes_);
+    });
+}
+
+void XMLCALL ExPatHandler::OnEnd(void* self, const XML_Char* name) {
+    auto* h = static_cast<ExPatHandler*>(self);
+    h->Guarded([&] {
+        h->name_.clear();
+        AppendUtf8AsUtf16(name, h->name_);
+        h->EndElement(h->name_);
+    });
+}
+
+void XMLCALL ExPatHandler::OnText(void* self, const XML_Char* text, int length) {
+    auto* h = static_cast<ExPatHandler*>(self);
+    h->Guarded([&] {
+        h->text_.clear();
+        AppendUtf8AsUtf16(std::string_view(text, static_cast<size_t>(length)), h->text_);
+        h->CharacterData(h->text_);
+    });
+}
+
+void XMLCALL ExPatHandler::OnPi(void* self, const XML_Char* target, const XML_Char* data) {
+    auto* h = static_cast<ExPatHandler*>(self);
+    h->Guarded([&] {
+        std::u16string t;
+        std::u16string d;
+        AppendUtf8AsUtf16(target, t);
+        AppendUtf8AsUtf16(data, d);
+        h->ProcessingInstruction(t, d);
+    });
+}
+
+void XMLCALL ExPatHandler::OnComment(void* self, const XML_Char* text) {
+    auto* h = static_cast<ExPatHandler*>(self);
+    h->Guarded([&] {
+        std::u16string t;
+        AppendUtf8AsUtf16(text, t);
+        h->Comment(t);
+    });
+}
+
+void XMLCALL ExPatHandler::OnCdataStart(void* self) {
+    auto* h = static_cast<ExPatHandler*>(self);
+    h->Guarded([&] { h->StartCdataSection(); });
+}
+
+void XMLCALL ExPatHandler::OnCdataEnd(void* self) {
+    auto* h = static_cast<ExPatHandler*>(self);
+    h->Guarded([&] { h->EndCdataSection(); });
+}
+
+} // namespace wbhw

@@ -1,0 +1,67 @@
+// The Expat adapter: events in wide strings, whole and split input, exceptions carried out.
+#include "resource_tree/ExPatHandler.h"
+
+#include <gtest/gtest.h>
+
+#include <stdexcept>
+#include <string>
+
+namespace {
+
+// Records every event as one line of text.
+class Recorder : public wbhw::ExPatHandler {
+public:
+    std::u16string log;
+    bool throwOnStart = false;
+
+    void StartElement(const std::u16string& name, const wbhw::XmlAttributes& atts) override {
+        if (throwOnStart)
+            throw std::runtime_error("handler failed");
+        log += u"<" + name;
+        for (const auto& [key, value] : atts)
+            log += u" " + key + u"=" + value;
+        log += u">";
+    }
+    void EndElement(const std::u16string& name) override { log += u"</" + name + u">"; }
+    void CharacterData(std::u16string_view text) override { log += text; }
+};
+
+const std::string kDoc = "<a Name='x' b='\xC3\xA9'>t\xF0\x9F\x98\x80<c/></a>";
+const std::u16string kExpected = u"<a b=\u00E9 Name=x>t\U0001F600<c></c></a>";
+
+TEST(ExPatHandler, DeliversWideEventsWholeOrOneByteAtATime) {
+    Recorder whole;
+    ASSERT_TRUE(whole.Parse(kDoc, true));
+    EXPECT_EQ(whole.log, kExpected);
+
+    Recorder bytewise;
+    for (const char c : kDoc)
+        ASSERT_TRUE(bytewise.Parse(std::string_view(&c, 1), false));
+    ASSERT_TRUE(bytewise.Parse({}, true));
+    EXPECT_EQ(bytewise.log, kExpected);
+}
+
+TEST(ExPatHandler, AttributeNamesAreOneKeyRegardlessOfCase) {
+    wbhw::XmlAttributes atts;
+    EXPECT_TRUE(atts.Insert(u"Name", u"first"));
+    EXPECT_FALSE(atts.Insert(u"NAME", u"second"));
+    EXPECT_EQ(atts.Get(u"name"), u"first");
+    EXPECT_EQ(atts.Get(u"absent"), u"");
+}
+
+TEST(ExPatHandler, HandlerExceptionIsRethrownAfterExpatReturns) {
+    Recorder r;
+    r.throwOnStart = true;
+    EXPECT_THROW(r.Parse("<a><b/></a>", true), std::runtime_error);
+}
+
+TEST(ExPatHandler, ReportsErrorWithLineAndColumn) {
+    Recorder r;
+    EXPECT_FALSE(r.Parse("<a>\n  <b></a>", true));
+    EXPECT_EQ(r.ErrorCode(), XML_ERROR_TAG_MISMATCH);
+    EXPECT_EQ(r.CurrentLine(), 2u);
+    EXPECT_EQ(r.CurrentColumn(), 7u);
+    EXPECT_FALSE(r.ErrorString().empty());
+}
+
+} // namespace
