@@ -1,10 +1,10 @@
 // The library's string class in its narrow (char) and wide (UTF-16, char16_t) forms.
 #pragma once
 
+#include "kern/exception/Exception.h"
+
 #include <string>
 #include <string_view>
-
-#include "kern/exception/Exception.h"
 
 namespace qv::kern {
 

@@ -8,7 +8,9 @@
 namespace qv::kern {
 namespace {
 
-bool IsContinuation(unsigned char c) { return (c & 0xC0u) == 0x80u; }
+bool IsContinuation(unsigned char c) {
+    return (c & 0xC0u) == 0x80u;
+}
 
 // Decodes one sequence at s[i]; stores the unit and answers the sequence's length.
 size_t DecodeOne(std::string_view s, size_t i, char16_t& unit) {

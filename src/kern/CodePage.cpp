@@ -1,0 +1,130 @@
+// Code-page conversion through ICU converters, one cached converter per name and thread.
+#include "kern/CodePage.h"
+
+#include "kern/exception/Exception.h"
+#include "kern/osdep/OSException.h"
+
+#include <climits>
+#include <cstdlib>
+#include <memory>
+#include <new>
+#include <unicode/ucnv.h>
+#include <utility>
+#include <vector>
+
+namespace qv::kern {
+namespace {
+
+constexpr char kDefaultCodePage[] = "windows-1252";
+constexpr char kCodePageVariable[] = "WBTANGIO_CODEPAGE";
+// Windows error codes for a conversion that cannot run.
+constexpr uint32_t kInvalidParameter = 87;
+constexpr uint32_t kNoUnicodeTranslation = 1113;
+
+struct ConverterCloser {
+    void operator()(UConverter* c) const noexcept { ucnv_close(c); }
+};
+using ConverterPtr = std::unique_ptr<UConverter, ConverterCloser>;
+
+[[noreturn]] void RaiseConversionFailure(UErrorCode status) {
+    if (status == U_MEMORY_ALLOCATION_ERROR)
+        throw std::bad_alloc();
+    const bool badText = status == U_INVALID_CHAR_FOUND || status == U_ILLEGAL_CHAR_FOUND ||
+                         status == U_TRUNCATED_CHAR_FOUND;
+    QV_THROW(osdep::WinError(badText ? kNoUnicodeTranslation : kInvalidParameter));
+}
+
+// True when the name came from the environment rather than from the fixed list.
+bool IsConfiguredName(std::string_view codePage) {
+    return codePage.empty();
+}
+
+ConverterPtr OpenConverter(const std::string& name, bool configured) {
+    UErrorCode status = U_ZERO_ERROR;
+    ConverterPtr converter(ucnv_open(name.c_str(), &status));
+    if (U_FAILURE(status) || converter == nullptr) {
+        // A misspelt WBTANGIO_CODEPAGE is a bad locale setting; a fixed name that ICU lacks is
+        // the platform failing, as a missing code page is on Windows.
+        if (configured && status != U_MEMORY_ALLOCATION_ERROR)
+            QV_THROW(exception::InvalidLocale());
+        RaiseConversionFailure(status);
+    }
+    // Windows writes "?" for characters a code page lacks; ICU's default would be SUB (0x1A).
+    status = U_ZERO_ERROR;
+    ucnv_setSubstChars(converter.get(), "?", 1, &status);
+    return converter;
+}
+
+// This thread's converter for the name: converters keep state, so they are never shared.
+UConverter* ThreadConverter(std::string_view codePage) {
+    thread_local std::vector<std::pair<std::string, ConverterPtr>> cache;
+    const std::string name = ConverterName(codePage);
+    for (const auto& [cachedName, converter] : cache) {
+        if (cachedName == name)
+            return converter.get();
+    }
+    cache.emplace_back(name, OpenConverter(name, IsConfiguredName(codePage)));
+    return cache.back().second.get();
+}
+
+int32_t CheckedLength(size_t size) {
+    if (size > static_cast<size_t>(INT32_MAX))
+        QV_THROW(osdep::WinError(kInvalidParameter));
+    return static_cast<int32_t>(size);
+}
+
+} // namespace
+
+std::string ConverterName(std::string_view codePage) {
+    if (codePage == "US-ASCII" || codePage == "cp932")
+        return std::string(codePage);
+    if (!codePage.empty())
+        QV_THROW(exception::InvalidLocale());
+    const char* configured = std::getenv(kCodePageVariable);
+    return configured != nullptr && *configured != '\0' ? std::string(configured)
+                                                        : std::string(kDefaultCodePage);
+}
+
+std::u16string AnsiToWide(std::string_view text, std::string_view codePage) {
+    UConverter* const converter = ThreadConverter(codePage);
+    if (text.empty())
+        return std::u16string();
+    const int32_t length = CheckedLength(text.size());
+    // One byte never gives more than one UTF-16 unit in the code pages we use; the second pass
+    // covers any that does.
+    std::u16string out(text.size(), u'\0');
+    UErrorCode status = U_ZERO_ERROR;
+    int32_t units = ucnv_toUChars(converter, out.data(), CheckedLength(out.size()), text.data(),
+                                  length, &status);
+    if (status == U_BUFFER_OVERFLOW_ERROR) {
+        out.assign(static_cast<size_t>(units), u'\0');
+        status = U_ZERO_ERROR;
+        units = ucnv_toUChars(converter, out.data(), units, text.data(), length, &status);
+    }
+    if (U_FAILURE(status))
+        RaiseConversionFailure(status);
+    out.resize(static_cast<size_t>(units));
+    return out;
+}
+
+std::string WideToAnsi(std::u16string_view text, std::string_view codePage) {
+    UConverter* const converter = ThreadConverter(codePage);
+    if (text.empty())
+        return std::string();
+    const int32_t length = CheckedLength(text.size());
+    std::string out(text.size() * 2, '\0');
+    UErrorCode status = U_ZERO_ERROR;
+    int32_t bytes = ucnv_fromUChars(converter, out.data(), CheckedLength(out.size()), text.data(),
+                                    length, &status);
+    if (status == U_BUFFER_OVERFLOW_ERROR) {
+        out.assign(static_cast<size_t>(bytes), '\0');
+        status = U_ZERO_ERROR;
+        bytes = ucnv_fromUChars(converter, out.data(), bytes, text.data(), length, &status);
+    }
+    if (U_FAILURE(status))
+        RaiseConversionFailure(status);
+    out.resize(static_cast<size_t>(bytes));
+    return out;
+}
+
+} // namespace qv::kern

@@ -1,0 +1,196 @@
+// Name collation: ICU at secondary strength, and a rank table for ASCII names that the
+// constructor derives from the very same collator, so both paths give one answer.
+//
+// Why the table is exact: when every character of two texts maps to one collation element of
+// its own (no expansion, no contraction, not ignorable), and characters that share a primary
+// weight also share the secondary one, a secondary-strength comparison is decided by the
+// sequence of primary weights alone. Ranking the characters by the collator then orders the
+// texts as the collator does. The constructor admits only characters for which it can check
+// these conditions, so a tailoring that breaks them (contractions such as "ch", numeric
+// ordering, ignorable punctuation) simply sends those texts to ICU.
+#include "kern/NameCollator.h"
+
+#include <algorithm>
+#include <climits>
+#include <unicode/ucol.h>
+#include <unicode/uset.h>
+#include <vector>
+
+namespace qv::kern {
+namespace {
+
+struct SetCloser {
+    void operator()(USet* s) const noexcept { uset_close(s); }
+};
+using SetPtr = std::unique_ptr<USet, SetCloser>;
+
+// ICU takes 32-bit lengths (a negative one would mean "up to the terminator").
+int32_t IcuLength(size_t n) {
+    return static_cast<int32_t>(std::min<size_t>(n, INT32_MAX));
+}
+
+int ToTriState(UCollationResult r) {
+    return r == UCOL_LESS ? -1 : (r == UCOL_GREATER ? 1 : 0);
+}
+
+UCollationResult CompareUnits(const UCollator* c, char16_t x, char16_t y) {
+    return ucol_strcoll(c, &x, 1, &y, 1);
+}
+
+UCollator* OpenAtStrength(const char* locale, UColAttributeValue strength) {
+    UErrorCode status = U_ZERO_ERROR;
+    UCollator* c = ucol_open(locale, &status);
+    if (U_FAILURE(status)) {
+        ucol_close(c);
+        return nullptr;
+    }
+    ucol_setStrength(c, strength);
+    return c;
+}
+
+// True when every unit of the text is an ASCII candidate.
+bool AllCandidates(const UChar* text, int32_t length, const std::array<bool, 128>& candidate) {
+    for (int32_t i = 0; i < length; ++i) {
+        if (text[i] >= 128 || !candidate[text[i]])
+            return false;
+    }
+    return true;
+}
+
+// Drops the candidates that take part in a contraction (or a prefix rule) made of candidates
+// only: such a text is no longer one element per character.
+void DropContractions(const UCollator* c, std::array<bool, 128>& candidate) {
+    UErrorCode status = U_ZERO_ERROR;
+    SetPtr contractions(uset_openEmpty());
+    SetPtr expansions(uset_openEmpty());
+    ucol_getContractionsAndExpansions(c, contractions.get(), expansions.get(), true, &status);
+    if (U_FAILURE(status)) {
+        candidate.fill(false);
+        return;
+    }
+    for (char16_t u = 0; u < 128; ++u) {
+        if (uset_contains(expansions.get(), u))
+            candidate[u] = false;
+    }
+    const int32_t items = uset_getItemCount(contractions.get());
+    for (int32_t i = 0; i < items; ++i) {
+        UChar32 start = 0;
+        UChar32 end = 0;
+        UChar text[64];
+        status = U_ZERO_ERROR;
+        const int32_t length = uset_getItem(contractions.get(), i, &start, &end, text, 64, &status);
+        if (U_FAILURE(status)) {
+            candidate.fill(false);
+            return;
+        }
+        if (length > 0 && AllCandidates(text, length, candidate)) {
+            for (int32_t k = 0; k < length; ++k)
+                candidate[text[k]] = false;
+        }
+    }
+}
+
+} // namespace
+
+void NameCollator::Closer::operator()(UCollator* c) const noexcept {
+    ucol_close(c);
+}
+
+NameCollator::NameCollator(const char* locale) : collator_(OpenAtStrength(locale, UCOL_SECONDARY)) {
+    if (collator_ != nullptr)
+        BuildAsciiRanks(locale);
+}
+
+NameCollator::~NameCollator() = default;
+
+void NameCollator::BuildAsciiRanks(const char* locale) {
+    UErrorCode status = U_ZERO_ERROR;
+    // Numeric ordering compares digit runs by value, not one digit at a time.
+    if (ucol_getAttribute(collator_.get(), UCOL_NUMERIC_COLLATION, &status) != UCOL_OFF ||
+        U_FAILURE(status))
+        return;
+    const CollatorPtr primary(OpenAtStrength(locale, UCOL_PRIMARY));
+    if (primary == nullptr)
+        return;
+    std::array<bool, 128> candidate{};
+    const UChar none = 0;
+    for (char16_t u = 0; u < 128; ++u) {
+        // An ignorable character (controls; punctuation when it is shifted) vanishes at primary
+        // strength, so a text is no longer one element per character.
+        candidate[u] = ucol_strcoll(primary.get(), &u, 1, &none, 0) != UCOL_EQUAL;
+    }
+    DropContractions(collator_.get(), candidate);
+
+    std::vector<char16_t> order;
+    for (char16_t u = 0; u < 128; ++u) {
+        if (candidate[u])
+            order.push_back(u);
+    }
+    if (order.empty())
+        return;
+    const UCollator* secondary = collator_.get();
+    std::stable_sort(order.begin(), order.end(), [secondary](char16_t x, char16_t y) {
+        return CompareUnits(secondary, x, y) == UCOL_LESS;
+    });
+    uint8_t rank = 1;
+    ranks_[order[0]] = rank;
+    for (size_t i = 1; i < order.size(); ++i) {
+        if (CompareUnits(secondary, order[i - 1], order[i]) == UCOL_EQUAL) {
+            ranks_[order[i]] = rank;
+            continue;
+        }
+        // Neighbours that differ only at the secondary level would be ordered by the table
+        // before the rest of the text is looked at; ICU looks at all primaries first.
+        if (CompareUnits(primary.get(), order[i - 1], order[i]) == UCOL_EQUAL) {
+            ranks_.fill(0);
+            return;
+        }
+        ranks_[order[i]] = ++rank;
+    }
+    fastPath_ = true;
+}
+
+int NameCollator::CompareRanks(std::u16string_view a, std::u16string_view b) const noexcept {
+    int answer = 0;
+    const size_t common = std::min(a.size(), b.size());
+    for (size_t i = 0; i < common; ++i) {
+        const char16_t x = a[i];
+        const char16_t y = b[i];
+        if (x >= 128 || y >= 128 || ranks_[x] == 0 || ranks_[y] == 0)
+            return 2;
+        if (answer == 0 && ranks_[x] != ranks_[y])
+            answer = ranks_[x] < ranks_[y] ? -1 : 1;
+    }
+    // The tails must be rankable too: only then is the first difference the answer.
+    const std::u16string_view tail = a.size() > common ? a.substr(common) : b.substr(common);
+    for (const char16_t u : tail) {
+        if (u >= 128 || ranks_[u] == 0)
+            return 2;
+    }
+    if (answer != 0 || a.size() == b.size())
+        return answer;
+    return a.size() < b.size() ? -1 : 1;
+}
+
+int NameCollator::CompareWithCollator(std::u16string_view a, std::u16string_view b) const noexcept {
+    if (collator_ == nullptr)
+        return 0;
+    return ToTriState(ucol_strcoll(collator_.get(), a.data(), IcuLength(a.size()), b.data(),
+                                   IcuLength(b.size())));
+}
+
+int NameCollator::Compare(std::u16string_view a, std::u16string_view b) const noexcept {
+    if (collator_ == nullptr)
+        return 0;
+    if (fastPath_) {
+        const int answer = CompareRanks(a, b);
+        if (answer != 2)
+            return answer;
+    }
+    // Texts identical unit for unit are equal in every collation.
+    if (a == b)
+        return 0;
+    return CompareWithCollator(a, b);
+}
+
+} // namespace qv::kern
