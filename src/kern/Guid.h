@@ -2,7 +2,6 @@
 #pragma once
 
 #include <cstdint>
-#include <cstring>
 
 namespace qv::kern {
 
@@ -16,27 +15,33 @@ struct Guid {
 static_assert(sizeof(Guid) == 16, "Guid must keep the 16-byte Windows layout");
 
 // True when all sixteen bytes are equal.
-inline bool operator==(const Guid& a, const Guid& b) noexcept {
-    return a.Data1 == b.Data1 && a.Data2 == b.Data2 && a.Data3 == b.Data3 &&
-           std::memcmp(a.Data4, b.Data4, sizeof a.Data4) == 0;
+constexpr bool operator==(const Guid& a, const Guid& b) noexcept {
+    if (a.Data1 != b.Data1 || a.Data2 != b.Data2 || a.Data3 != b.Data3)
+        return false;
+    for (int i = 0; i < 8; ++i) {
+        if (a.Data4[i] != b.Data4[i])
+            return false;
+    }
+    return true;
 }
-inline bool operator!=(const Guid& a, const Guid& b) noexcept {
+constexpr bool operator!=(const Guid& a, const Guid& b) noexcept {
     return !(a == b);
 }
 
 // Orders by Data1, then Data2, then Data3, then the eight bytes of Data4 in turn.
-inline bool operator<(const Guid& a, const Guid& b) noexcept {
+constexpr bool operator<(const Guid& a, const Guid& b) noexcept {
     if (a.Data1 != b.Data1)
         return a.Data1 < b.Data1;
     if (a.Data2 != b.Data2)
         return a.Data2 < b.Data2;
     if (a.Data3 != b.Data3)
         return a.Data3 < b.Data3;
-    return std::memcmp(a.Data4, b.Data4, sizeof a.Data4) < 0;
+    for (int i = 0; i < 8; ++i) {
+        if (a.Data4[i] != b.Data4[i])
+            return a.Data4[i] < b.Data4[i];
+    }
+    return false;
 }
-
-// The all-zero GUID.
-inline constexpr Guid kNullGuid{0, 0, 0, {0, 0, 0, 0, 0, 0, 0, 0}};
 
 // A new random GUID (version 4, RFC 4122 variant) from the system's random source; raises
 // InitializationFailure when the source fails.

@@ -12,6 +12,7 @@
 
 #include <algorithm>
 #include <climits>
+#include <initializer_list>
 #include <unicode/ucol.h>
 #include <unicode/uset.h>
 #include <vector>
@@ -104,11 +105,13 @@ NameCollator::NameCollator(const char* locale) : collator_(OpenAtStrength(locale
 NameCollator::~NameCollator() = default;
 
 void NameCollator::BuildAsciiRanks(const char* locale) {
-    UErrorCode status = U_ZERO_ERROR;
-    // Numeric ordering compares digit runs by value, not one digit at a time.
-    if (ucol_getAttribute(collator_.get(), UCOL_NUMERIC_COLLATION, &status) != UCOL_OFF ||
-        U_FAILURE(status))
-        return;
+    // Numeric ordering compares digit runs by value, not one digit at a time; a case level
+    // orders case after the accents of the whole text, not character by character.
+    for (const UColAttribute attribute : {UCOL_NUMERIC_COLLATION, UCOL_CASE_LEVEL}) {
+        UErrorCode status = U_ZERO_ERROR;
+        if (ucol_getAttribute(collator_.get(), attribute, &status) != UCOL_OFF || U_FAILURE(status))
+            return;
+    }
     const CollatorPtr primary(OpenAtStrength(locale, UCOL_PRIMARY));
     if (primary == nullptr)
         return;
