@@ -83,3 +83,11 @@ function(wbt_add_fuzzer name)
     add_test(NAME replay.${name} COMMAND ${name} ${corpus})
   endif()
 endfunction()
+
+# wbt_link_host_runtime(TARGET): makes the executable TARGET a host process: it carries every
+# function of the embedded host runtime (whole archive, so nothing unused is dropped) and exports
+# them with "gWBRTVersion", so modules and the binding find the runtime in the main executable.
+function(wbt_link_host_runtime target)
+  target_link_libraries(${target} PRIVATE "$<LINK_LIBRARY:WHOLE_ARCHIVE,wbhost_runtime>")
+  set_target_properties(${target} PROPERTIES ENABLE_EXPORTS ON)
+endfunction()
