@@ -22,6 +22,7 @@ inline constexpr HRESULT E_ACCESSDENIED = MakeHResult(0x80070005u);
 inline constexpr HRESULT E_OUTOFMEMORY = MakeHResult(0x8007000Eu);
 inline constexpr HRESULT E_INVALIDARG = MakeHResult(0x80070057u);
 inline constexpr HRESULT CLASS_E_NOAGGREGATION = MakeHResult(0x80040110u);
+inline constexpr HRESULT CLASS_E_CLASSNOTAVAILABLE = MakeHResult(0x80040111u);
 
 // True for success statuses (0, 1 and every other non-negative value).
 constexpr bool SUCCEEDED(HRESULT hr) {
