@@ -1,0 +1,153 @@
+// The text helpers, called through the loaded module with host strings that the embedded host's
+// runtime allocates, as a host program hands them over.
+#include "LoadedModule.h"
+#include "runtime/Runtime.h"
+
+#include <cstdint>
+#include <cstdlib>
+#include <cstring>
+#include <gtest/gtest.h>
+#include <string>
+
+namespace {
+
+using MbsToWcs = int32_t(WBHandle, WBHandle);
+using WcsWcs = int32_t(WBHandle, WBHandle);
+using McbOffsets = void(WBHandle, int32_t*, int32_t*);
+using IsInvalidChar = uint8_t(WBHandle, const char*);
+
+// A host string block owned by the test, made and resized by the host runtime.
+class HostText {
+public:
+    explicit HostText(std::string_view bytes) {
+        EXPECT_EQ(NumericArrayResize(kWBTypeU8, 1, &handle_, bytes.size()), 0);
+        const auto count = static_cast<int32_t>(bytes.size());
+        std::memcpy(*handle_, &count, sizeof count);
+        std::memcpy(static_cast<char*>(*handle_) + sizeof count, bytes.data(), bytes.size());
+    }
+    ~HostText() { DSDisposeHandle(handle_); }
+    HostText(const HostText&) = delete;
+    HostText& operator=(const HostText&) = delete;
+
+    WBHandle handle() const { return handle_; }
+    std::string bytes() const {
+        int32_t count = 0;
+        std::memcpy(&count, *handle_, sizeof count);
+        return std::string(static_cast<const char*>(*handle_) + sizeof count, count);
+    }
+
+private:
+    WBHandle handle_ = nullptr;
+};
+
+// Runs each test with a chosen default code page, and the module loaded.
+class TextExports : public ::testing::Test {
+protected:
+    void TearDown() override { unsetenv("WBTANGIO_CODEPAGE"); }
+    static void UseCodePage(const char* name) { setenv("WBTANGIO_CODEPAGE", name, 1); }
+
+    test::LoadedModule module;
+    MbsToWcs* mbstowcs = module.Find<MbsToWcs>("TIO_mbstowcs");
+    MbsToWcs* wcstombs = module.Find<MbsToWcs>("TIO_wcstombs");
+    WcsWcs* wcswcs = module.Find<WcsWcs>("TIO_wcswcs");
+    McbOffsets* mbcOffsets = module.Find<McbOffsets>("TIO_mbcOffsets");
+    IsInvalidChar* isInvalid = module.Find<IsInvalidChar>("TIOCommon_IsInvalidChar");
+
+    void SetUp() override {
+        ASSERT_TRUE(module.Loaded()) << test::LoadedModule::LoadError();
+        ASSERT_TRUE(mbstowcs && wcstombs && wcswcs && mbcOffsets && isInvalid);
+    }
+    int32_t Find(std::string_view haystack, std::string_view needle) {
+        HostText h(haystack), n(needle);
+        return wcswcs(h.handle(), n.handle());
+    }
+    std::pair<int32_t, int32_t> Offsets(std::string_view text) {
+        HostText t(text);
+        int32_t first = 7, last = 7;
+        mbcOffsets(t.handle(), &first, &last);
+        return {first, last};
+    }
+};
+
+TEST_F(TextExports, ConvertBothWaysUpToTheFirstNul) {
+    HostText in(std::string("A\x80\0tail", 7)); // "A", euro sign in windows-1252, NUL
+    HostText out("stale");
+    ASSERT_EQ(mbstowcs(in.handle(), out.handle()), 0);
+    EXPECT_EQ(out.bytes(), std::string("A\0\xAC\x20", 4));
+
+    HostText wide(std::string("A\0\xAC\x20\0\0B\0\x01", 9)); // odd last byte ignored
+    ASSERT_EQ(wcstombs(wide.handle(), out.handle()), 0);
+    EXPECT_EQ(out.bytes(), "A\x80");
+
+    HostText empty("");
+    ASSERT_EQ(mbstowcs(empty.handle(), out.handle()), 0);
+    EXPECT_EQ(out.bytes(), "");
+
+    UseCodePage("cp932");
+    HostText kanji("\x93\xFA"); // one double-byte character
+    ASSERT_EQ(mbstowcs(kanji.handle(), out.handle()), 0);
+    EXPECT_EQ(out.bytes(), "\xE5\x65");
+}
+
+TEST_F(TextExports, ConversionFailuresComeBackAsHostErrors) {
+    HostText in("abc");
+    // A handle the host does not know cannot be resized: its error code, output untouched.
+    int32_t block[2] = {3, 0};
+    void* master = block;
+    EXPECT_EQ(mbstowcs(in.handle(), &master), kWBArgErr);
+    EXPECT_EQ(block[0], 3);
+    EXPECT_EQ(wcstombs(in.handle(), nullptr), kWBArgErr);
+    // A code page that cannot be opened is a failure, never an escaping exception.
+    UseCodePage("no-such-code-page");
+    HostText out("");
+    EXPECT_NE(mbstowcs(in.handle(), out.handle()), 0);
+    EXPECT_EQ(Find("abc", "b"), -1);
+}
+
+TEST_F(TextExports, SearchAnswersTheMatchsByteOffset) {
+    EXPECT_EQ(Find("abc", "x"), -1);
+    EXPECT_EQ(Find("abc", "ab"), 0);
+    EXPECT_EQ(Find("abc", ""), 0);
+    EXPECT_EQ(Find("aBc", "b"), -1); // case counts
+    // In windows-1252 the euro sign is one byte although its code is above U+00FF.
+    EXPECT_EQ(Find("ab\x80x", "x"), 3);
+    UseCodePage("cp932");
+    EXPECT_EQ(Find("ab\x93\xFAx", "x"), 4); // two ASCII, one kanji
+    EXPECT_EQ(Find("\xB1x", "x"), 1);       // half-width katakana: one byte
+    EXPECT_EQ(Find("\x81\x98x", "x"), 2);   // section sign: below U+0100 but two bytes
+    EXPECT_EQ(Find("\x93\xFA\x96\x7B", "\x96\x7B"), 2);
+    EXPECT_EQ(Find("\x93\xFA", "\xFA"), -1); // never a match inside a character
+}
+
+TEST_F(TextExports, FirstRunOfMultibyteCharacters) {
+    EXPECT_EQ(Offsets("plain"), std::make_pair(-1, -1));
+    EXPECT_EQ(Offsets(""), std::make_pair(-1, -1));
+    EXPECT_EQ(Offsets("a\x80"), std::make_pair(-1, -1)); // windows-1252 is single-byte
+    UseCodePage("cp932");
+    EXPECT_EQ(Offsets("ab\x93\xFA\x96\x7B"
+                      "c"),
+              std::make_pair(2, 5));
+    EXPECT_EQ(Offsets("\x93\xFA"
+                      "a\x96\x7B"),
+              std::make_pair(0, 1)); // only the first run
+    EXPECT_EQ(Offsets("a\xB1\x93\xFA"), std::make_pair(2, 3));
+}
+
+TEST_F(TextExports, InvalidCharacters) {
+    const char* const names = "\\'\"<>|";
+    auto check = [&](std::string_view text, const char* set) {
+        HostText t(text);
+        return isInvalid(t.handle(), set);
+    };
+    EXPECT_EQ(check("a\tb", ""), 1);
+    EXPECT_EQ(check("plain name", ""), 0);
+    EXPECT_EQ(check("plain name", nullptr), 0);
+    EXPECT_EQ(check("", names), 0);
+    EXPECT_EQ(check("a|b", names), 1);
+    EXPECT_EQ(check("a/b", names), 0);
+    // A forbidden character outside ASCII is found too.
+    EXPECT_EQ(check("caf\xE9", "\xE9"), 1);
+    EXPECT_EQ(check("cafe", "\xE9"), 0);
+}
+
+} // namespace
