@@ -2,6 +2,7 @@
 #pragma once
 
 #include "host/binding/EngineSearch.h"
+#include "host/binding/RuntimeLoader.h"
 #include "host/binding/WBCIntFunctions.h"
 #include "kern/osdep/DynamicModule.h"
 
