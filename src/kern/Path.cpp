@@ -58,6 +58,13 @@ bool SplitAbsolute(std::u16string_view p, WindowsPath& out) {
     return true;
 }
 
+// dir + "\" + name, appended piece by piece.
+std::u16string Below(std::u16string dir, std::u16string_view name) {
+    dir += u'\\';
+    dir += name;
+    return dir;
+}
+
 // Resolves the path against the current directory into root and rest.
 WindowsPath MakeAbsolute(const std::u16string& p, const std::u16string& current) {
     WindowsPath result;
@@ -70,12 +77,12 @@ WindowsPath MakeAbsolute(const std::u16string& p, const std::u16string& current)
         // "X:name": relative to the current directory when it is on drive X, else to X's root.
         const std::u16string tail = p.substr(2);
         if (HasDrive(base.root) && SameDrive(base.root[0], p[0]))
-            return tail.empty() ? base : WindowsPath{base.root, base.rest + u"\\" + tail};
-        return {p.substr(0, 2), u"\\" + p.substr(2)};
+            return tail.empty() ? base : WindowsPath{base.root, Below(base.rest, tail)};
+        return {p.substr(0, 2), Below(std::u16string(), tail)};
     }
     if (!p.empty() && p[0] == u'\\')
         return {base.root, p};
-    return {base.root, base.rest + u"\\" + p};
+    return {base.root, Below(base.rest, p)};
 }
 
 // Resolves "." and ".." and drops empty components; ".." at the root stays at the root.

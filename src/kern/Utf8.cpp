@@ -4,6 +4,7 @@
 #include "kern/exception/Exception.h"
 
 #include <cstdint>
+#include <cstring>
 
 namespace qv::kern {
 namespace {
@@ -40,18 +41,48 @@ size_t DecodeOne(std::string_view s, size_t i, char16_t& unit) {
     QV_THROW(exception::InvalidSequence());
 }
 
+// The length of the run of ASCII bytes at s[i], looked at eight bytes at a time: names and XML
+// text are mostly ASCII, and such runs need no decoding.
+size_t AsciiRun(std::string_view s, size_t i) {
+    const size_t start = i;
+    while (i + 8 <= s.size()) {
+        uint64_t word = 0;
+        std::memcpy(&word, s.data() + i, 8);
+        if ((word & 0x8080808080808080ull) != 0)
+            break;
+        i += 8;
+    }
+    while (i < s.size() && static_cast<unsigned char>(s[i]) < 0x80u)
+        ++i;
+    return i - start;
+}
+
 } // namespace
 
 std::u16string Utf8ToWide(std::string_view utf8) {
     // Count first with the same rules, so the result is allocated once.
     size_t units = 0;
     char16_t unit = 0;
-    for (size_t i = 0; i < utf8.size(); ++units)
-        i += DecodeOne(utf8, i, unit);
+    for (size_t i = 0; i < utf8.size();) {
+        const size_t run = AsciiRun(utf8, i);
+        units += run;
+        i += run;
+        if (i < utf8.size()) {
+            i += DecodeOne(utf8, i, unit);
+            ++units;
+        }
+    }
     std::u16string out(units, u'\0');
-    size_t o = 0;
-    for (size_t i = 0; i < utf8.size(); ++o)
-        i += DecodeOne(utf8, i, out[o]);
+    char16_t* o = out.data();
+    for (size_t i = 0; i < utf8.size();) {
+        const size_t run = AsciiRun(utf8, i);
+        for (size_t k = 0; k < run; ++k)
+            o[k] = static_cast<unsigned char>(utf8[i + k]);
+        o += run;
+        i += run;
+        if (i < utf8.size())
+            i += DecodeOne(utf8, i, *o++);
+    }
     return out;
 }
 
@@ -59,18 +90,18 @@ std::string WideToUtf8(std::u16string_view wide) {
     size_t bytes = 0;
     for (const char16_t u : wide)
         bytes += u < 0x80u ? 1 : (u < 0x800u ? 2 : 3);
-    std::string out;
-    out.reserve(bytes);
+    std::string out(bytes, '\0');
+    char* o = out.data();
     for (const char16_t u : wide) {
         if (u < 0x80u) {
-            out.push_back(static_cast<char>(u));
+            *o++ = static_cast<char>(u);
         } else if (u < 0x800u) {
-            out.push_back(static_cast<char>(0xC0u | (u >> 6)));
-            out.push_back(static_cast<char>(0x80u | (u & 0x3Fu)));
+            *o++ = static_cast<char>(0xC0u | (u >> 6));
+            *o++ = static_cast<char>(0x80u | (u & 0x3Fu));
         } else {
-            out.push_back(static_cast<char>(0xE0u | (u >> 12)));
-            out.push_back(static_cast<char>(0x80u | ((u >> 6) & 0x3Fu)));
-            out.push_back(static_cast<char>(0x80u | (u & 0x3Fu)));
+            *o++ = static_cast<char>(0xE0u | (u >> 12));
+            *o++ = static_cast<char>(0x80u | ((u >> 6) & 0x3Fu));
+            *o++ = static_cast<char>(0x80u | (u & 0x3Fu));
         }
     }
     return out;
