@@ -96,4 +96,9 @@ bool HandleTable::IsLive(WBHandle handle) const {
     return blocks_.count(handle) != 0;
 }
 
+size_t HandleTable::LiveCount() const {
+    const std::lock_guard guard(lock_);
+    return blocks_.size();
+}
+
 } // namespace wbhost::runtime
