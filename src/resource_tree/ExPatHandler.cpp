@@ -1,10 +1,9 @@
 // The adapter between Expat and wide-string event handlers.
 #include "resource_tree/ExPatHandler.h"
 
-#include <unicode/ustring.h>
-
 #include <cstring>
 #include <new>
+#include <unicode/ustring.h>
 
 namespace wbhw {
 
@@ -64,7 +63,9 @@ bool ExPatHandler::Parse(std::string_view utf8, bool isFinal) {
     return status != XML_STATUS_ERROR;
 }
 
-XML_Error ExPatHandler::ErrorCode() const noexcept { return XML_GetErrorCode(parser_.get()); }
+XML_Error ExPatHandler::ErrorCode() const noexcept {
+    return XML_GetErrorCode(parser_.get());
+}
 
 std::string ExPatHandler::ErrorString() const {
     const XML_LChar* text = XML_ErrorString(ErrorCode());

@@ -3,9 +3,8 @@
 
 #include "resource_tree/XmlAttributes.h"
 
-#include <expat.h>
-
 #include <exception>
+#include <expat.h>
 #include <memory>
 #include <string>
 #include <string_view>

@@ -2,7 +2,6 @@
 #include "resource_tree/ExPatHandler.h"
 
 #include <gtest/gtest.h>
-
 #include <stdexcept>
 #include <string>
 

@@ -1,0 +1,28 @@
+// What a resource-tree load may be told beyond its document: language, directories and limits.
+#pragma once
+
+#include <cstddef>
+#include <string>
+
+namespace wbhw {
+
+// Settings of one load and of every load nested in it (includes, deferred files). Empty texts
+// mean "ask the host"; the limits keep hostile or broken documents from exhausting the process.
+struct LoaderSettings {
+    // The user-interface language that picks localized texts; empty: the host's language.
+    std::u16string language;
+    // Directory that ":Include" paths are relative to; empty: the host directory.
+    std::string includeDirectory;
+    // Directory that ":DeferredLoadPath" files are relative to; empty: the executable's directory.
+    std::string deferredDirectory;
+    // Loads nested inside a load (includes and deferred files) deeper than this are refused.
+    int maxNestedLoads = 32;
+    // Node elements nested deeper than this stop the load.
+    int maxElementDepth = 1000;
+    // A "names" value yields at most this many names; the rest are dropped.
+    size_t maxNames = 200000;
+    // Entries one load (with everything nested in it) may make, copies included.
+    size_t maxEntries = 16u * 1024u * 1024u;
+};
+
+} // namespace wbhw

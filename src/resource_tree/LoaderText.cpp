@@ -1,0 +1,285 @@
+// Text rules of the resource-tree loader: booleans, names ranges, variables, localized texts,
+// platform paths and the UTF-8 form handed to Expat.
+#include "resource_tree/LoaderText.h"
+
+#include "resource_tree/ExPatHandler.h"
+#include "resource_tree/ListText.h"
+
+#include <array>
+#include <unistd.h>
+
+namespace wbhw {
+namespace {
+
+bool IsDigits(std::u16string_view text) noexcept {
+    if (text.empty())
+        return false;
+    for (const char16_t c : text) {
+        if (c < u'0' || c > u'9')
+            return false;
+    }
+    return true;
+}
+
+// Decimal digits as a number; values beyond 64 bits stay at the largest value, which no range
+// can reach anyway since expansion is capped.
+uint64_t ParseDecimal(std::u16string_view digits) noexcept {
+    uint64_t value = 0;
+    for (const char16_t c : digits) {
+        const uint64_t digit = static_cast<uint64_t>(c - u'0');
+        if (value > (UINT64_MAX - digit) / 10)
+            return UINT64_MAX;
+        value = value * 10 + digit;
+    }
+    return value;
+}
+
+std::u16string Decimal(uint64_t value) {
+    std::u16string text;
+    do {
+        text.insert(text.begin(), static_cast<char16_t>(u'0' + value % 10));
+        value /= 10;
+    } while (value != 0);
+    return text;
+}
+
+// A piece prefix[var=first..last]suffix, split into its parts.
+struct Range {
+    std::u16string_view prefix, variable, suffix;
+    uint64_t first = 0, last = 0;
+};
+
+bool ParseRange(std::u16string_view piece, Range& range) {
+    const size_t open = piece.find(u'[');
+    if (open == std::u16string_view::npos)
+        return false;
+    const size_t equals = piece.find(u'=', open + 1);
+    if (equals == std::u16string_view::npos)
+        return false;
+    const size_t dots = piece.find(u"..", equals + 1);
+    if (dots == std::u16string_view::npos)
+        return false;
+    const size_t close = piece.find(u']', dots + 2);
+    if (close == std::u16string_view::npos)
+        return false;
+    const std::u16string_view first = piece.substr(equals + 1, dots - equals - 1);
+    const std::u16string_view last = piece.substr(dots + 2, close - dots - 2);
+    if (!IsDigits(first) || !IsDigits(last))
+        return false;
+    range.prefix = piece.substr(0, open);
+    range.variable = piece.substr(open + 1, equals - open - 1);
+    range.suffix = piece.substr(close + 1);
+    range.first = ParseDecimal(first);
+    range.last = ParseDecimal(last);
+    return true;
+}
+
+std::string DirectoryOf(const std::string& path) {
+    const size_t slash = path.find_last_of('/');
+    if (slash == std::string::npos)
+        return ".";
+    return slash == 0 ? std::string("/") : path.substr(0, slash);
+}
+
+std::string ExecutablePath() {
+    std::array<char, 4096> buffer{};
+    const ssize_t n = readlink("/proc/self/exe", buffer.data(), buffer.size() - 1);
+    return n > 0 ? std::string(buffer.data(), static_cast<size_t>(n)) : std::string();
+}
+
+bool HasHostExecutable(const std::string& directory) {
+    for (const char* name : {"Wirebench.exe", "wbre.exe", "wbde.exe"}) {
+        if (access(JoinFilePath(directory, name).c_str(), F_OK) == 0)
+            return true;
+    }
+    return false;
+}
+
+std::string FindHostDirectory() {
+    const std::string exe = ExecutablePath();
+    std::string directory = DirectoryOf(exe);
+    if (exe.substr(exe.find_last_of('/') + 1) != "wbfpga_make_resource_cache")
+        return directory;
+    // The cache builder runs from a tool folder below the host; the host is the nearest
+    // directory above it that holds one of the host executables.
+    for (std::string at = directory;;) {
+        if (HasHostExecutable(at))
+            return at;
+        if (at == "/" || at == ".")
+            return directory;
+        at = DirectoryOf(at);
+    }
+}
+
+void AppendUtf8(char32_t c, std::string& out) {
+    if (c < 0x80) {
+        out.push_back(static_cast<char>(c));
+    } else if (c < 0x800) {
+        out.push_back(static_cast<char>(0xC0 | (c >> 6)));
+        out.push_back(static_cast<char>(0x80 | (c & 0x3F)));
+    } else if (c < 0x10000) {
+        out.push_back(static_cast<char>(0xE0 | (c >> 12)));
+        out.push_back(static_cast<char>(0x80 | ((c >> 6) & 0x3F)));
+        out.push_back(static_cast<char>(0x80 | (c & 0x3F)));
+    } else {
+        out.push_back(static_cast<char>(0xF0 | (c >> 18)));
+        out.push_back(static_cast<char>(0x80 | ((c >> 12) & 0x3F)));
+        out.push_back(static_cast<char>(0x80 | ((c >> 6) & 0x3F)));
+        out.push_back(static_cast<char>(0x80 | (c & 0x3F)));
+    }
+}
+
+} // namespace
+
+bool IsTrueWord(std::u16string_view text) noexcept {
+    for (const std::u16string_view word : {u"true", u"yes", u"1", u"on", u"enable"}) {
+        if (qv::kern::EqualsNoCase(text, word))
+            return true;
+    }
+    return false;
+}
+
+std::vector<ExpandedName> ExpandNames(std::u16string_view value, size_t limit, bool& truncated) {
+    truncated = false;
+    std::vector<ExpandedName> names;
+    for (const std::u16string& piece : SplitListText(value, u',', true)) {
+        Range range;
+        if (!ParseRange(piece, range)) {
+            if (names.size() >= limit) {
+                truncated = true;
+                break;
+            }
+            names.push_back({piece, {}, 0});
+            continue;
+        }
+        for (uint64_t i = range.first; i <= range.last; ++i) {
+            if (names.size() >= limit) {
+                truncated = true;
+                return names;
+            }
+            std::u16string name(range.prefix);
+            name += Decimal(i);
+            name += range.suffix;
+            names.push_back({std::move(name), std::u16string(range.variable), i});
+            if (i == UINT64_MAX)
+                break;
+        }
+    }
+    return names;
+}
+
+bool SubstituteVariables(std::u16string& text, const VariableMap& variables) {
+    if (variables.empty() || text.find(u"#{") == std::u16string::npos)
+        return false;
+    std::u16string out;
+    bool changed = false;
+    size_t at = 0;
+    for (;;) {
+        const size_t open = text.find(u"#{", at);
+        const size_t close = open == std::u16string::npos ? open : text.find(u'}', open + 2);
+        if (close == std::u16string::npos) {
+            out.append(text, at, std::u16string::npos);
+            break;
+        }
+        const std::u16string_view name =
+            TrimBlanks(std::u16string_view(text).substr(open + 2, close - open - 2));
+        const auto found = variables.find(name);
+        if (found != variables.end()) {
+            out.append(text, at, open - at);
+            out += found->second;
+            changed = true;
+        } else {
+            out.append(text, at, close + 1 - at);
+        }
+        at = close + 1;
+    }
+    if (changed)
+        text = std::move(out);
+    return changed;
+}
+
+std::u16string LocalizeText(std::u16string_view value, std::u16string_view language) {
+    const std::vector<std::u16string> entries = SplitListText(value, u',', true);
+    auto choose = [&entries](std::u16string_view wanted) -> const std::u16string* {
+        for (const std::u16string& entry : entries) {
+            const size_t equals = entry.find(u'=');
+            if (equals == std::u16string::npos)
+                continue;
+            if (qv::kern::EqualsNoCase(std::u16string_view(entry).substr(0, equals), wanted))
+                return &entry;
+        }
+        return nullptr;
+    };
+    const std::u16string* chosen = choose(language);
+    if (chosen == nullptr)
+        chosen = choose(u"eng");
+    if (chosen == nullptr)
+        return std::u16string(value);
+    std::u16string stored = chosen->substr(chosen->find(u'=') + 1);
+    stored.push_back(u'\0');
+    stored += value;
+    return stored;
+}
+
+std::u16string PlatformPathText(std::u16string_view text) {
+    std::u16string out;
+    // A leading separator keeps the path absolute; other empty pieces join to nothing.
+    if (!text.empty() && text.front() == u'/')
+        out.push_back(u'/');
+    for (const std::u16string& piece : SplitListText(text, u'/', false)) {
+        if (piece.empty())
+            continue;
+        if (!out.empty() && out.back() != u'/')
+            out.push_back(u'/');
+        out += piece;
+    }
+    return out;
+}
+
+std::string JoinFilePath(const std::string& base, const std::string& relative) {
+    if (base.empty() || (!relative.empty() && relative.front() == '/'))
+        return relative;
+    if (relative.empty())
+        return base;
+    return base.back() == '/' ? base + relative : base + "/" + relative;
+}
+
+std::string ToUtf8(std::u16string_view text) {
+    std::string out;
+    out.reserve(text.size() + text.size() / 4);
+    for (size_t i = 0; i < text.size(); ++i) {
+        const char16_t c = text[i];
+        if (c < 0x80) {
+            out.push_back(static_cast<char>(c));
+            continue;
+        }
+        if (c >= 0xD800 && c < 0xDC00 && i + 1 < text.size() && text[i + 1] >= 0xDC00 &&
+            text[i + 1] < 0xE000) {
+            const char32_t code = 0x10000 + ((static_cast<char32_t>(c) - 0xD800) << 10) +
+                                  (static_cast<char32_t>(text[i + 1]) - 0xDC00);
+            AppendUtf8(code, out);
+            ++i;
+            continue;
+        }
+        AppendUtf8(c, out);
+    }
+    return out;
+}
+
+std::u16string FromUtf8Lenient(std::string_view bytes) {
+    std::u16string out;
+    AppendUtf8AsUtf16(bytes, out);
+    return out;
+}
+
+const std::string& HostDirectory() {
+    static const std::string directory = FindHostDirectory();
+    return directory;
+}
+
+const std::string& ExecutableDirectory() {
+    static const std::string directory = DirectoryOf(ExecutablePath());
+    return directory;
+}
+
+} // namespace wbhw

@@ -1,0 +1,59 @@
+// Text rules of the resource-tree loader: booleans, names ranges, variables, localized texts,
+// platform paths and the UTF-8 form handed to Expat.
+#pragma once
+
+#include "kern/Collate.h"
+
+#include <cstdint>
+#include <map>
+#include <string>
+#include <string_view>
+#include <vector>
+
+namespace wbhw {
+
+// True when TEXT is "true", "yes", "1", "on" or "enable", ignoring case.
+bool IsTrueWord(std::u16string_view text) noexcept;
+
+// One name of a "names" list: the name, and the range variable and index that produced it.
+struct ExpandedName {
+    std::u16string name;
+    std::u16string variable; // empty when the name was not produced by a range
+    uint64_t index = 0;
+};
+
+// Expands a "names" value: pieces split at "," with trimming; a piece prefix[var=first..last]suffix
+// gives prefix+i+suffix for i from first to last. At most LIMIT names are made; TRUNCATED tells
+// whether more were asked for.
+std::vector<ExpandedName> ExpandNames(std::u16string_view value, size_t limit, bool& truncated);
+
+// Variables by name, ignoring case.
+using VariableMap = std::map<std::u16string, std::u16string, qv::kern::LessNoCase>;
+
+// Replaces every "#{" name "}" whose trimmed name is in VARIABLES; an "#{" without "}" ends the
+// substitution. Answers whether anything was replaced.
+bool SubstituteVariables(std::u16string& text, const VariableMap& variables);
+
+// Picks the entry of a "lang=text, lang=text" list for LANGUAGE, failing that for "eng": the
+// chosen text, a NUL and the whole VALUE. VALUE unchanged when no entry fits.
+std::u16string LocalizeText(std::u16string_view value, std::u16string_view language);
+
+// A "/"-separated path text rebuilt in the platform's form (pieces joined with the path join).
+std::u16string PlatformPathText(std::u16string_view text);
+
+// BASE and RELATIVE joined with the platform separator; RELATIVE alone when it is absolute.
+std::string JoinFilePath(const std::string& base, const std::string& relative);
+
+// Standard UTF-8 for a UTF-16 text (pairs become four bytes; a lone surrogate is written as its
+// three-byte form, which a strict reader rejects).
+std::string ToUtf8(std::u16string_view text);
+
+// UTF-16 for bytes that should be UTF-8; undecodable bytes become U+FFFD.
+std::u16string FromUtf8Lenient(std::string_view bytes);
+
+// The directory that ":Include" paths are relative to, worked out once per process.
+const std::string& HostDirectory();
+// The directory of the running executable.
+const std::string& ExecutableDirectory();
+
+} // namespace wbhw

@@ -1,0 +1,251 @@
+// The resource-tree builder: what a pending element becomes (node, text, link, include, capture).
+#include "kern/osdep/OSException.h"
+#include "resource_tree/ListText.h"
+#include "resource_tree/ParseStack.h"
+
+namespace wbhw {
+namespace {
+
+bool Equals(const std::u16string* value, std::u16string_view word) noexcept {
+    return value != nullptr && qv::kern::EqualsNoCase(*value, word);
+}
+
+} // namespace
+
+void ParseStack::Capture(Frame& frame) {
+    ++frame.captureDepth;
+    std::u16string tag = u"<";
+    tag += frame.pendingName;
+    // Attribute values go in as they are, unescaped, as stored captures always held them.
+    for (const auto& [key, value] : frame.pendingAttributes) {
+        tag += u' ';
+        tag += key;
+        tag += u"=\"";
+        tag += value;
+        tag += u'"';
+    }
+    tag += u'>';
+    frame.node->AppendTextAt(frame.position, tag);
+    frame.hasPending = false;
+    frame.pendingName.clear();
+    frame.text.clear();
+}
+
+ParseStack::Frame* ParseStack::ProcessPending(Frame& frame, bool container) {
+    if (frame.capturing) {
+        // Nested markup is captured completely: the child that made this element a container
+        // becomes pending in the same frame and is written when its turn comes.
+        Capture(frame);
+        return &frame;
+    }
+    const Steering steering = ReadSteering(frame.pendingAttributes);
+    const TagInfo& tag = context_.ClassifyTag(frame.pendingName);
+    ResTreeNode& node = *frame.node;
+    std::u16string name;
+    bool isNode = false;
+    if (steering.names != nullptr) {
+        bool truncated = false;
+        frame.pendingNames = ExpandNames(*steering.names, context_.settings.maxNames, truncated);
+        if (truncated) {
+            AddError(node, u"The names list yields more than " +
+                               DecimalText(context_.settings.maxNames) +
+                               u" names; the rest are left out: " + *steering.names);
+        }
+        if (frame.pendingNames.empty()) {
+            AddError(node,
+                     u"The names list yields no name; the element is skipped: " + *steering.names);
+            frame.hasPending = false;
+            frame.text.clear();
+            // The child that was seen and the element's own end tag.
+            frame.ignoreDepth = container ? 2 : 0;
+            return nullptr;
+        }
+        name = frame.pendingNames.front().name;
+        isNode = true;
+    } else if (steering.name != nullptr) {
+        name = *steering.name;
+        isNode = !tag.isLink;
+    } else {
+        name = frame.pendingName;
+        isNode = steering.prototype != nullptr || container;
+    }
+    if (isNode)
+        return ProcessNode(frame, container, name, steering, tag);
+    if (container) {
+        // A named link whose element holds markup: the markup is no path and must not end the
+        // enclosing node's frame, so it is passed over and the link's own text is its path.
+        if (!frame.linkChildrenReported)
+            AddError(node, u"Child elements of a :Link element are ignored: " + name);
+        frame.linkChildrenReported = true;
+        frame.ignoreDepth = 1;
+        return nullptr;
+    }
+    ProcessText(frame, name, steering, tag);
+    return nullptr;
+}
+
+ResTreePosition ParseStack::InsertPosition(ResTreeNode& node, const Steering& steering) {
+    if (steering.next == nullptr)
+        return node.End();
+    return node.FindLoading(*steering.next);
+}
+
+ParseStack::Frame* ParseStack::ProcessNode(Frame& frame, bool container, const std::u16string& name,
+                                           const Steering& steering, const TagInfo& tag) {
+    ResTreeNode& node = *frame.node;
+    if (Equals(steering.type, u"xml")) {
+        ResTreePosition at = node.IsOrdered() ? node.End() : node.Find(name);
+        if (at == node.End()) {
+            CountEntry(node);
+            at = node.AddText(InsertPosition(node, steering), name, WString()).position;
+        }
+        frame.capturing = true;
+        frame.position = at;
+        frame.captureDepth = 1;
+        // A childless element ends here; leaving it pending would capture its next sibling.
+        frame.hasPending = false;
+        frame.text.clear();
+        return container ? &frame : nullptr;
+    }
+    const bool ordered =
+        steering.ordered != nullptr ? IsTrueWord(*steering.ordered) : tag.isListType;
+    // "replace" rules this element and what is made inside it, not its later siblings.
+    const bool overwrite =
+        steering.replace != nullptr ? !IsTrueWord(*steering.replace) : frame.overwrite;
+    const std::u16string tagName = frame.pendingName;
+    frame.hasPending = false;
+
+    if (frame.documentType.empty()) {
+        if (node.Type().empty()) {
+            node.SetNameAndType(name, tagName);
+            node.SetOrdered(ordered);
+        }
+        frame.documentType = node.Type();
+        if (frames_[0]->documentRoot == nullptr)
+            frames_[0]->documentRoot = &node;
+        frame.pendingNames.clear();
+        return container ? &Push(node, frame, overwrite) : nullptr;
+    }
+
+    ResTreeNode* prototype = nullptr;
+    if (steering.prototype != nullptr) {
+        prototype = node.ResolvePath(*steering.prototype, OuterDocumentRoot());
+        if (prototype == nullptr)
+            AddError(node, u"Unable to find prototype node: " + *steering.prototype);
+    }
+    const bool hadPrototype = prototype != nullptr;
+    MergeOrReplace(node, name, tagName, ordered, overwrite, &prototype);
+    CountEntry(node);
+    const auto made = node.AddChild(InsertPosition(node, steering), name, tagName, ordered);
+    if (hadPrototype && prototype == nullptr)
+        AddError(node, u"Unable to find prototype node: " + *steering.prototype);
+    if (prototype != nullptr &&
+        (IsAncestorOrSelf(prototype, made.node) || IsAncestorOrSelf(made.node, prototype))) {
+        // Copying a node into itself or into a node below it never ends.
+        AddError(node, u"The prototype node contains the node being built or lies inside it: " +
+                           *steering.prototype);
+        prototype = nullptr;
+    }
+    if (prototype != nullptr) {
+        NodeInUse keep(prototype);
+        CopyEntries(*prototype, *made.node, overwrite, 0);
+        SubstituteInSubtree(*made.node, ContextVariables(), 0);
+    }
+    if (frames_[0]->documentRoot == nullptr)
+        frames_[0]->documentRoot = made.node;
+    if (frame.pendingNames.size() >= 2) {
+        frame.namesTemplate = made.node;
+        frame.templatePosition = made.position;
+        frame.namesOverwrite = overwrite;
+    }
+    return container ? &Push(*made.node, frame, overwrite) : nullptr;
+}
+
+void ParseStack::ProcessText(Frame& frame, const std::u16string& name, const Steering& steering,
+                             const TagInfo& tag) {
+    ResTreeNode& node = *frame.node;
+    std::u16string text = std::move(frame.text);
+    frame.text.clear();
+    frame.hasPending = false;
+    if (!Equals(steering.xmlSpace, u"preserve"))
+        text = std::u16string(TrimBlanks(text));
+    const bool isPath = steering.type != nullptr ? Equals(steering.type, u"path") : tag.isPathText;
+    const bool isReferenceList =
+        steering.type != nullptr ? Equals(steering.type, u"ref-list") : tag.isReserves;
+    if (isPath)
+        text = PlatformPathText(text);
+    if (tag.isLink) {
+        ProcessLink(frame, name, text, steering);
+        return;
+    }
+    if (tag.isInclude) {
+        ProcessInclude(frame, text, steering);
+        return;
+    }
+    if (text.find(u"#{") != std::u16string::npos)
+        SubstituteVariables(text, ContextVariables());
+    if (isReferenceList)
+        text = RewriteReferenceList(node, text);
+    EntryKind kind = EntryKind::Text;
+    if (steering.localize != nullptr && IsTrueWord(*steering.localize)) {
+        text = LocalizeText(text, context_.language);
+        kind = EntryKind::LocalizedText;
+    }
+    CountEntry(node);
+    const auto added = node.AddText(InsertPosition(node, steering), name, text, kind);
+    if (!added.inserted && frame.overwrite && node.SetTextAt(added.position, std::move(text)) &&
+        kind == EntryKind::LocalizedText)
+        node.SetTextKindAt(added.position, kind);
+}
+
+std::u16string ParseStack::RewriteReferenceList(ResTreeNode& node,
+                                                const std::u16string& text) const {
+    std::vector<std::u16string> pieces = SplitListText(text, u',', true);
+    const WString base = node.Path();
+    for (std::u16string& piece : pieces) {
+        if (!piece.empty() && piece.front() == u'/')
+            piece = RelativeResourcePath(base, piece);
+    }
+    return JoinListText(pieces, u',');
+}
+
+void ParseStack::ProcessLink(Frame& frame, const std::u16string& name, const std::u16string& path,
+                             const Steering& steering) {
+    ResTreeNode& node = *frame.node;
+    ResTreeNode* target = node.ResolvePath(path, OuterDocumentRoot());
+    CountEntry(node);
+    if (target == nullptr) {
+        node.AddText(InsertPosition(node, steering), name, u"UNRESOLVED LINK: " + path);
+        return;
+    }
+    const WString linkName = steering.name != nullptr ? WString(name) : target->Name();
+    const std::u16string linkText = RelativeResourcePath(node.Path(), target->Path());
+    const auto added = node.AddLink(InsertPosition(node, steering), linkName, linkText);
+    if (!added.inserted && frame.overwrite && IsTextKind(added.position->Kind()))
+        node.SetTextAt(added.position, linkText);
+}
+
+void ParseStack::ProcessInclude(Frame& frame, const std::u16string& path,
+                                const Steering& steering) {
+    ResTreeNode& node = *frame.node;
+    const std::string& directory = context_.settings.includeDirectory.empty()
+                                       ? HostDirectory()
+                                       : context_.settings.includeDirectory;
+    const std::string file = JoinFilePath(directory, ToUtf8(path));
+    const bool asChild = !Equals(steering.what, u"children");
+    ParseStack* const outer = context_.innermost;
+    try {
+        ResTreeNode* included = nullptr;
+        node.ParseFile(file, asChild, &included);
+        context_.innermost = outer;
+        if (included != nullptr)
+            SubstituteInSubtree(*included, ContextVariables(), 0);
+        else
+            AddError(node, u"Unable to find include file node: " + FromUtf8Lenient(file));
+    } catch (const qv::kern::osdep::OSException&) {
+        context_.innermost = outer;
+        AddError(node, u"Encountered an OS exception.");
+    }
+}
+
+} // namespace wbhw

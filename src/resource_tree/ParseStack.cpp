@@ -1,0 +1,248 @@
+// The resource-tree builder: events, frames and the messages written to "XMLParseErrors".
+#include "resource_tree/ParseStack.h"
+
+#include <utility>
+
+namespace wbhw {
+namespace {
+
+constexpr std::u16string_view kParseErrors = u"XMLParseErrors";
+
+size_t NodeDepth(const ResTreeNode& node) noexcept {
+    size_t depth = 0;
+    for (const ResTreeNode* at = node.Parent(); at != nullptr; at = at->Parent())
+        ++depth;
+    return depth;
+}
+
+} // namespace
+
+bool IsAncestorOrSelf(const ResTreeNode* ancestor, const ResTreeNode* node) noexcept {
+    for (const ResTreeNode* at = node; at != nullptr; at = at->Parent()) {
+        if (at == ancestor)
+            return true;
+    }
+    return false;
+}
+
+std::u16string DecimalText(uint64_t value) {
+    std::u16string text;
+    do {
+        text.insert(text.begin(), static_cast<char16_t>(u'0' + value % 10));
+        value /= 10;
+    } while (value != 0);
+    return text;
+}
+
+ParseStack::ParseStack(ResTreeNode& node, bool asChild, LoadContext& context,
+                       std::u16string filePath)
+    : context_(context), filePath_(std::move(filePath)) {
+    frames_.push_back(std::make_unique<Frame>());
+    depth_ = 1;
+    Frame& outer = *frames_[0];
+    outer.node = &node;
+    if (asChild)
+        outer.documentType = node.Type();
+    node.MarkInUse();
+}
+
+ParseStack::~ParseStack() {
+    while (depth_ > 0) {
+        frames_[depth_ - 1]->node->UnmarkInUse();
+        --depth_;
+    }
+}
+
+ResTreeNode* ParseStack::DocumentRoot() const noexcept {
+    return frames_[0]->documentRoot;
+}
+
+ParseStack::Frame& ParseStack::Push(ResTreeNode& node, const Frame& enclosing, bool overwrite) {
+    if (NodeDepth(node) > static_cast<size_t>(context_.settings.maxElementDepth)) {
+        Abort(*enclosing.node, u"Elements are nested deeper than " +
+                                   DecimalText(context_.settings.maxElementDepth) + u" levels.");
+    }
+    if (frames_.size() == depth_)
+        frames_.push_back(std::make_unique<Frame>());
+    Frame& frame = *frames_[depth_];
+    frame.node = &node;
+    frame.documentRoot = nullptr;
+    frame.capturing = false;
+    frame.captureDepth = 0;
+    frame.documentType = enclosing.documentType;
+    frame.hasPending = false;
+    frame.pendingName.clear();
+    frame.pendingAttributes.clear();
+    frame.text.clear();
+    frame.pendingNames.clear();
+    frame.namesTemplate = nullptr;
+    frame.overwrite = overwrite;
+    frame.ignoreDepth = 0;
+    node.MarkInUse();
+    ++depth_;
+    return frame;
+}
+
+void ParseStack::Pop() noexcept {
+    Frame& frame = Top();
+    frame.node->UnmarkInUse();
+    frame.node = nullptr;
+    --depth_;
+}
+
+void ParseStack::SetPending(Frame& frame, const std::u16string& name, const XmlAttributes& atts) {
+    frame.hasPending = true;
+    frame.pendingName = name;
+    frame.pendingAttributes = atts;
+    frame.text.clear();
+    frame.pendingNames.clear();
+    frame.linkChildrenReported = false;
+}
+
+void ParseStack::StartElement(const std::u16string& name, const XmlAttributes& attributes) {
+    Frame& frame = Top();
+    if (frame.ignoreDepth > 0) {
+        ++frame.ignoreDepth;
+        return;
+    }
+    if (!frame.hasPending) {
+        SetPending(frame, name, attributes);
+        return;
+    }
+    if (Frame* target = ProcessPending(frame, true))
+        SetPending(*target, name, attributes);
+}
+
+void ParseStack::EndElement(const std::u16string& name) {
+    Frame& frame = Top();
+    if (frame.ignoreDepth > 0) {
+        --frame.ignoreDepth;
+        return;
+    }
+    const bool hadPending = frame.hasPending;
+    if (hadPending)
+        ProcessPending(frame, false);
+    if (frame.capturing) {
+        if (frame.captureDepth >= 2) {
+            std::u16string closing = u"</";
+            closing += name;
+            closing += u">";
+            frame.node->AppendTextAt(frame.position, closing);
+            --frame.captureDepth;
+        } else {
+            frame.capturing = false;
+        }
+    } else if (!hadPending && depth_ > 1 && frame.node->Parent() != nullptr) {
+        Pop();
+    }
+    Frame& top = Top();
+    if (top.pendingNames.size() >= 2)
+        MakeNameCopies(top);
+    top.pendingNames.clear();
+}
+
+void ParseStack::CharacterData(std::u16string_view text) {
+    Frame& frame = Top();
+    if (frame.ignoreDepth == 0)
+        frame.text += text;
+}
+
+ParseStack::Steering ParseStack::ReadSteering(const XmlAttributes& attributes) {
+    Steering steering;
+    for (const auto& [key, value] : attributes) {
+        switch (context_.ClassifyAttribute(key)) {
+        case LoaderAttribute::Name:
+            steering.name = &value;
+            break;
+        case LoaderAttribute::Names:
+            steering.names = &value;
+            break;
+        case LoaderAttribute::Prototype:
+            steering.prototype = &value;
+            break;
+        case LoaderAttribute::Next:
+            steering.next = &value;
+            break;
+        case LoaderAttribute::Ordered:
+            steering.ordered = &value;
+            break;
+        case LoaderAttribute::Replace:
+            steering.replace = &value;
+            break;
+        case LoaderAttribute::Type:
+            steering.type = &value;
+            break;
+        case LoaderAttribute::XmlSpace:
+            steering.xmlSpace = &value;
+            break;
+        case LoaderAttribute::Localize:
+            steering.localize = &value;
+            break;
+        case LoaderAttribute::What:
+            steering.what = &value;
+            break;
+        case LoaderAttribute::Other:
+            break;
+        }
+    }
+    return steering;
+}
+
+void ParseStack::CountEntry(ResTreeNode& node) {
+    if (++context_.entriesMade <= context_.settings.maxEntries)
+        return;
+    Abort(node, u"The load was stopped: it would make more than " +
+                    DecimalText(context_.settings.maxEntries) + u" entries.");
+}
+
+void ParseStack::Abort(ResTreeNode& node, std::u16string_view message) {
+    AddError(node, message);
+    throw LoadAborted{};
+}
+
+std::u16string ParseStack::InputAroundPosition() {
+    int offset = 0;
+    const std::string_view held = InputContext(offset);
+    if (held.empty())
+        return {};
+    const size_t at = std::min(static_cast<size_t>(std::max(offset, 0)), held.size());
+    // From the second newline before the position to the second newline after it: the line
+    // before, the current line and the line after.
+    size_t begin = 0;
+    int newlines = 0;
+    for (size_t i = at; i > 0; --i) {
+        if (held[i - 1] == '\n' && ++newlines == 2) {
+            begin = i - 1;
+            break;
+        }
+    }
+    size_t end = held.size();
+    newlines = 0;
+    for (size_t i = at; i < held.size(); ++i) {
+        if (held[i] == '\n' && ++newlines == 2) {
+            end = i + 1;
+            break;
+        }
+    }
+    return FromUtf8Lenient(held.substr(begin, end - begin));
+}
+
+void ParseStack::AddError(ResTreeNode& node, std::u16string_view message) {
+    std::u16string text = u"Error on line " + DecimalText(CurrentLine()) + u" at column " +
+                          DecimalText(CurrentColumn());
+    if (!filePath_.empty())
+        text += u" of file " + filePath_;
+    text += u"\n   ";
+    text += message;
+    text += u"\n   ";
+    text += InputAroundPosition();
+    text += u"\n";
+    const ResTreePosition found = node.Find(kParseErrors);
+    if (found != node.End() && IsTextKind(found->Kind())) {
+        node.AppendTextAt(found, text);
+        return;
+    }
+    node.AddText(node.End(), WString(std::u16string(kParseErrors)), WString(std::move(text)));
+}
+
+} // namespace wbhw

@@ -1,0 +1,115 @@
+// The resource-tree builder: turns the events of one document into entries of a node.
+#pragma once
+
+#include "resource_tree/ExPatHandler.h"
+#include "resource_tree/LoadContext.h"
+#include "resource_tree/LoaderText.h"
+#include "resource_tree/ResTreeNode.h"
+
+#include <memory>
+#include <string>
+#include <vector>
+
+namespace wbhw {
+
+// Builds a node's entries from one document. One frame per node being filled; a frame's pending
+// element is the one whose start was seen but which is not yet known to be a node or a text.
+class ParseStack final : public ExPatHandler {
+public:
+    // Fills NODE; ASCHILD makes the document element a new child of NODE. FILEPATH (may be empty)
+    // is named in messages.
+    ParseStack(ResTreeNode& node, bool asChild, LoadContext& context, std::u16string filePath);
+    ~ParseStack() override;
+
+    void StartElement(const std::u16string& name, const XmlAttributes& attributes) override;
+    void EndElement(const std::u16string& name) override;
+    void CharacterData(std::u16string_view text) override;
+
+    // The node the document element became (null until then).
+    ResTreeNode* DocumentRoot() const noexcept;
+    // Appends MESSAGE to NODE's "XMLParseErrors" with the parser's line, column and context.
+    void AddError(ResTreeNode& node, std::u16string_view message);
+
+private:
+    struct Frame {
+        ResTreeNode* node = nullptr;
+        ResTreeNode* documentRoot = nullptr;
+        ResTreePosition position;
+        bool capturing = false;
+        int captureDepth = 0;
+        std::u16string documentType;
+        bool hasPending = false;
+        std::u16string pendingName;
+        XmlAttributes pendingAttributes;
+        std::u16string text;
+        std::vector<ExpandedName> pendingNames;
+        ResTreeNode* namesTemplate = nullptr;
+        ResTreePosition templatePosition;
+        bool namesOverwrite = true;
+        bool overwrite = true;
+        int ignoreDepth = 0;
+        bool linkChildrenReported = false;
+    };
+
+    // The attributes of the pending element that steer the loader; null when absent.
+    struct Steering {
+        const std::u16string* name = nullptr;
+        const std::u16string* names = nullptr;
+        const std::u16string* prototype = nullptr;
+        const std::u16string* next = nullptr;
+        const std::u16string* ordered = nullptr;
+        const std::u16string* replace = nullptr;
+        const std::u16string* type = nullptr;
+        const std::u16string* xmlSpace = nullptr;
+        const std::u16string* localize = nullptr;
+        const std::u16string* what = nullptr;
+    };
+
+    Frame& Top() noexcept { return *frames_[depth_ - 1]; }
+    Frame& Push(ResTreeNode& node, const Frame& enclosing, bool overwrite);
+    void Pop() noexcept;
+    static void SetPending(Frame& frame, const std::u16string& name, const XmlAttributes& atts);
+    Steering ReadSteering(const XmlAttributes& attributes);
+    ResTreeNode* OuterDocumentRoot() const noexcept { return frames_[0]->documentRoot; }
+
+    // Element processing (ParseElement.cpp). Answers the frame in which the child element that
+    // made the pending element a container becomes pending; null when it is to be ignored.
+    Frame* ProcessPending(Frame& frame, bool container);
+    Frame* ProcessNode(Frame& frame, bool container, const std::u16string& name,
+                       const Steering& steering, const TagInfo& tag);
+    void ProcessText(Frame& frame, const std::u16string& name, const Steering& steering,
+                     const TagInfo& tag);
+    void ProcessLink(Frame& frame, const std::u16string& name, const std::u16string& path,
+                     const Steering& steering);
+    void ProcessInclude(Frame& frame, const std::u16string& path, const Steering& steering);
+    void Capture(Frame& frame);
+    ResTreePosition InsertPosition(ResTreeNode& node, const Steering& steering);
+    std::u16string RewriteReferenceList(ResTreeNode& node, const std::u16string& text) const;
+
+    // Copies and variables (TreeCopy.cpp).
+    void MergeOrReplace(ResTreeNode& node, const std::u16string& name, const std::u16string& type,
+                        bool ordered, bool overwrite, ResTreeNode** guarded);
+    void CopyEntries(ResTreeNode& source, ResTreeNode& destination, bool overwrite, int depth);
+    void MakeNameCopies(Frame& frame);
+    void SubstituteInSubtree(ResTreeNode& node, const VariableMap& variables, int depth);
+    VariableMap ContextVariables() const;
+
+    // Counts one entry made; past the limit the load stops with a message in NODE.
+    void CountEntry(ResTreeNode& node);
+    [[noreturn]] void Abort(ResTreeNode& node, std::u16string_view message);
+    std::u16string InputAroundPosition();
+
+    LoadContext& context_;
+    std::u16string filePath_;
+    // Frames are reused from one element to the next so that their buffers keep their capacity.
+    std::vector<std::unique_ptr<Frame>> frames_;
+    size_t depth_ = 0;
+};
+
+// True when ANCESTOR is NODE or one of NODE's ancestors.
+bool IsAncestorOrSelf(const ResTreeNode* ancestor, const ResTreeNode* node) noexcept;
+
+// The decimal text of VALUE.
+std::u16string DecimalText(uint64_t value);
+
+} // namespace wbhw

@@ -1,0 +1,304 @@
+// A node of a resource tree: entries, lookups, insertion and removal.
+#include "resource_tree/ResTreeNode.h"
+
+#include "kern/Collate.h"
+
+#include <utility>
+
+namespace wbhw {
+namespace {
+
+constexpr std::u16string_view kDisplayName = u"DisplayName";
+
+// Links may point at links; a chain that loops back would otherwise recurse without end.
+constexpr int kMaxLinkHops = 64;
+thread_local int linkHops = 0;
+
+} // namespace
+
+ResTreeEntry::ResTreeEntry(WString name, EntryKind kind) : name_(std::move(name)), kind_(kind) {}
+
+ResTreeEntry::~ResTreeEntry() = default;
+
+const WString* ResTreeEntry::Text() const noexcept {
+    return (IsTextKind(kind_) || kind_ == EntryKind::Link) ? &text_ : nullptr;
+}
+
+bool EntryNameLess::operator()(const ResTreeEntry& a, const ResTreeEntry& b) const noexcept {
+    return qv::kern::CompareNoCase(a.Name(), b.Name()) < 0;
+}
+bool EntryNameLess::operator()(const ResTreeEntry& a, std::u16string_view b) const noexcept {
+    return qv::kern::CompareNoCase(a.Name(), b) < 0;
+}
+bool EntryNameLess::operator()(std::u16string_view a, const ResTreeEntry& b) const noexcept {
+    return qv::kern::CompareNoCase(a, b.Name()) < 0;
+}
+
+ResTreePosition& ResTreePosition::operator++() noexcept {
+    if (ordered_)
+        ++list_;
+    else
+        ++set_;
+    return *this;
+}
+
+ResTreeNode::ResTreeNode(WString name, WString type, bool ordered)
+    : name_(std::move(name)), type_(std::move(type)), ordered_(ordered), parent_(nullptr) {}
+
+ResTreeNode::ResTreeNode(WString name, WString type, bool ordered, ResTreeNode* parent)
+    : name_(std::move(name)), type_(std::move(type)), ordered_(ordered), parent_(parent) {}
+
+ResTreeNode::~ResTreeNode() {
+    StopWatchingAll();
+    parent_ = nullptr;
+    // Children unregister from this node while it is still whole.
+    list_.clear();
+    set_.clear();
+}
+
+ResTreeNode& ResTreeNode::Root() noexcept {
+    ResTreeNode* node = this;
+    while (node->parent_ != nullptr)
+        node = node->parent_;
+    return *node;
+}
+
+ResTreeNode::Position ResTreeNode::Begin() const noexcept {
+    return ordered_ ? Position(list_.begin()) : Position(set_.begin());
+}
+
+ResTreeNode::Position ResTreeNode::End() const noexcept {
+    return ordered_ ? Position(list_.end()) : Position(set_.end());
+}
+
+ResTreeNode::Position ResTreeNode::Find(std::u16string_view name) const noexcept {
+    if (!ordered_)
+        return Position(set_.find(name));
+    for (auto it = list_.begin(); it != list_.end(); ++it) {
+        if (qv::kern::EqualsNoCase(it->Name(), name))
+            return Position(it);
+    }
+    return End();
+}
+
+ResTreeNode::Position ResTreeNode::FindLoading(std::u16string_view name) {
+    Position found = Find(name);
+    if (found != End())
+        return found;
+    if (Find(u":DeferredLoadPath") == End())
+        return found;
+    LoadDeferred();
+    return Find(name);
+}
+
+ResTreeNode* ResTreeNode::NodeAt(Position position) {
+    if (position == End())
+        return nullptr;
+    if (position->Kind() == EntryKind::Child)
+        return position->Child();
+    if (position->Kind() != EntryKind::Link || position->text_.empty())
+        return nullptr;
+    if (linkHops >= kMaxLinkHops)
+        return nullptr;
+    ++linkHops;
+    struct Hop {
+        ~Hop() { --linkHops; }
+    } hop;
+    return ResolvePath(position->text_, nullptr);
+}
+
+const WString* ResTreeNode::TextAt(std::u16string_view name) {
+    const Position found = FindLoading(name);
+    if (found == End() || !IsTextKind(found->Kind()))
+        return nullptr;
+    return &found->text_;
+}
+
+ResTreeNode::Position ResTreeNode::InsertEntry(Position position, WString&& name, EntryKind kind,
+                                               bool& inserted) {
+    if (ordered_) {
+        inserted = true;
+        const auto before = position.ordered_ ? position.list_ : list_.end();
+        return Position(list_.emplace(before, std::move(name), kind));
+    }
+    const auto hint = set_.lower_bound(std::u16string_view(name));
+    if (hint != set_.end() && qv::kern::EqualsNoCase(hint->Name(), name)) {
+        inserted = false;
+        return Position(hint);
+    }
+    inserted = true;
+    return Position(set_.emplace_hint(hint, std::move(name), kind));
+}
+
+ResTreeNode::AddResult ResTreeNode::AddText(Position position, WString name, WString text,
+                                            EntryKind kind) {
+    if (!IsTextKind(kind))
+        kind = EntryKind::Text;
+    bool inserted = false;
+    const Position at = InsertEntry(position, std::move(name), kind, inserted);
+    if (inserted) {
+        at->text_ = std::move(text);
+        RaiseChanges(kValueAdded);
+    }
+    return {at, inserted};
+}
+
+ResTreeNode::AddResult ResTreeNode::AddLink(Position position, WString name, WString path) {
+    bool inserted = false;
+    const Position at = InsertEntry(position, std::move(name), EntryKind::Link, inserted);
+    if (inserted) {
+        at->text_ = std::move(path);
+        RaiseChanges(kChildAdded);
+    }
+    return {at, inserted};
+}
+
+ResTreeNode::AddChildResult ResTreeNode::AddChild(Position position, WString name, WString type,
+                                                  bool ordered) {
+    bool inserted = false;
+    WString childName = name;
+    const Position at = InsertEntry(position, std::move(name), EntryKind::Child, inserted);
+    if (!inserted)
+        return {at, at->child_.get(), false};
+    at->child_ =
+        std::make_unique<ResTreeNode>(std::move(childName), std::move(type), ordered, this);
+    RaiseChanges(kChildAdded);
+    return {at, at->child_.get(), true};
+}
+
+bool ResTreeNode::SetTextAt(Position position, WString text) {
+    if (position == End() || !IsTextKind(position->Kind()))
+        return false;
+    position->text_ = std::move(text);
+    RaiseChanges(kValueChanged);
+    if (qv::kern::EqualsNoCase(position->Name(), kDisplayName)) {
+        RaiseChanges(kDisplayNameChanged);
+        if (parent_ != nullptr)
+            parent_->RaiseChanges(kChildDisplayNameChanged);
+    }
+    return true;
+}
+
+bool ResTreeNode::AppendTextAt(Position position, std::u16string_view text) {
+    if (position == End() || !IsTextKind(position->Kind()))
+        return false;
+    position->text_ += text;
+    RaiseChanges(kValueChanged);
+    if (qv::kern::EqualsNoCase(position->Name(), kDisplayName)) {
+        RaiseChanges(kDisplayNameChanged);
+        if (parent_ != nullptr)
+            parent_->RaiseChanges(kChildDisplayNameChanged);
+    }
+    return true;
+}
+
+bool ResTreeNode::SetText(std::u16string_view name, WString text) {
+    const Position found = FindLoading(name);
+    if (found == End()) {
+        AddText(End(), WString(std::u16string(name)), std::move(text), EntryKind::Text);
+        return true;
+    }
+    return SetTextAt(found, std::move(text));
+}
+
+bool ResTreeNode::SetTextKindAt(Position position, EntryKind kind) {
+    if (position == End() || !IsTextKind(position->Kind()) || !IsTextKind(kind))
+        return false;
+    position->kind_ = kind;
+    return true;
+}
+
+void ResTreeNode::EraseEntry(Position position) noexcept {
+    if (ordered_)
+        list_.erase(position.list_);
+    else
+        set_.erase(position.set_);
+}
+
+bool ResTreeNode::RemoveAt(Position position) {
+    if (position == End())
+        return false;
+    const EntryKind kind = position->Kind();
+    ResTreeNode* child = position->child_.get();
+    if (child != nullptr) {
+        // A load still fills this child (or a node below it); deleting it would pull the node
+        // out from under the load.
+        if (child->IsInUse())
+            return false;
+        child->RaiseChanges(kDetaching);
+        child->RemoveAllChildren();
+        child->RaiseChanges(kDetached);
+    }
+    position->child_.reset();
+    position->text_.clear();
+    position->kind_ = EntryKind::Empty;
+    EraseEntry(position);
+    if (kind == EntryKind::Child || kind == EntryKind::Link)
+        RaiseChanges(kChildRemoved);
+    else if (IsTextKind(kind))
+        RaiseChanges(kValueRemoved);
+    return true;
+}
+
+void ResTreeNode::RemoveByName(std::u16string_view name) {
+    const Position found = Find(name);
+    if (found != End())
+        RemoveAt(found);
+}
+
+void ResTreeNode::RemoveAllChildren() {
+    std::vector<Position> children;
+    for (Position it = Begin(); it != End(); ++it) {
+        if (it->Kind() == EntryKind::Child && it->Child() != nullptr)
+            children.push_back(it);
+    }
+    if (ordered_) {
+        for (auto it = children.rbegin(); it != children.rend(); ++it)
+            RemoveAt(*it);
+        return;
+    }
+    for (const Position& child : children)
+        RemoveAt(child);
+}
+
+void ResTreeNode::SetOrdered(bool ordered) {
+    if (ordered == ordered_)
+        return;
+    if (ordered) {
+        while (!set_.empty()) {
+            auto handle = set_.extract(set_.begin());
+            ResTreeEntry& entry = handle.value();
+            auto& moved = list_.emplace_back(std::move(entry.name_), entry.kind_);
+            moved.text_ = std::move(entry.text_);
+            moved.child_ = std::move(entry.child_);
+        }
+    } else {
+        while (!list_.empty()) {
+            ResTreeEntry& entry = list_.front();
+            auto [at, inserted] = set_.emplace(entry.name_, entry.kind_);
+            if (inserted) {
+                at->text_ = std::move(entry.text_);
+                at->child_ = std::move(entry.child_);
+            }
+            list_.pop_front();
+        }
+    }
+    ordered_ = ordered;
+}
+
+void ResTreeNode::SetNameAndType(WString name, WString type) {
+    name_ = std::move(name);
+    type_ = std::move(type);
+}
+
+void ResTreeNode::MarkInUse() noexcept {
+    for (ResTreeNode* node = this; node != nullptr; node = node->parent_)
+        ++node->useCount_;
+}
+
+void ResTreeNode::UnmarkInUse() noexcept {
+    for (ResTreeNode* node = this; node != nullptr; node = node->parent_)
+        --node->useCount_;
+}
+
+} // namespace wbhw

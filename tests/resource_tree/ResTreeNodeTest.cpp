@@ -1,0 +1,163 @@
+// Resource-tree nodes: entries, lookups, removal, paths, links and reservations.
+#include "resource_tree/ResTreeNode.h"
+
+#include "TreeTestSupport.h"
+#include "resource_tree/TypeRegistry.h"
+
+#include <gtest/gtest.h>
+
+namespace wbhw {
+namespace {
+using namespace test;
+
+std::vector<std::u16string> Names(const ResTreeNode& node) {
+    std::vector<std::u16string> names;
+    for (ResTreePosition at = node.Begin(); at != node.End(); ++at)
+        names.push_back(at->Name());
+    return names;
+}
+
+TEST(ResTreeNode, UnorderedNodesKeepOneEntryPerNameRegardlessOfCase) {
+    ResTreeNode node(u"n", u"IOResource", false);
+    EXPECT_TRUE(node.AddText(node.End(), u"Pin", u"1").inserted);
+    const auto again = node.AddText(node.End(), u"PIN", u"2");
+    EXPECT_FALSE(again.inserted);
+    EXPECT_EQ(*again.position->Text(), u"1");
+    node.AddText(node.End(), u"alpha", u"");
+    node.AddText(node.End(), u"Beta", u"");
+    EXPECT_EQ(Names(node), (std::vector<std::u16string>{u"alpha", u"Beta", u"Pin"}));
+    // An existing name of another kind is answered as it is.
+    const auto child = node.AddChild(node.End(), u"pin", u"X", false);
+    EXPECT_FALSE(child.created);
+    EXPECT_EQ(child.node, nullptr);
+}
+
+TEST(ResTreeNode, OrderedNodesKeepDuplicatesInInsertionOrder) {
+    ResTreeNode node(u"n", u"ResourceList", true);
+    node.AddText(node.End(), u"Pin", u"first");
+    const auto second = node.AddText(node.End(), u"PIN", u"second");
+    EXPECT_TRUE(second.inserted);
+    node.AddText(second.position, u"before", u"");
+    EXPECT_EQ(Names(node), (std::vector<std::u16string>{u"Pin", u"before", u"PIN"}));
+    EXPECT_EQ(*node.Find(u"pin")->Text(), u"first");
+}
+
+TEST(ResTreeNode, TextsAreSetOnlyOnTextEntries) {
+    ResTreeNode root(u"", u"Target", false);
+    EXPECT_TRUE(root.SetText(u"Value", u"1"));
+    EXPECT_EQ(*root.TextAt(u"value"), u"1");
+    EXPECT_TRUE(root.SetText(u"VALUE", u"2"));
+    EXPECT_EQ(*root.TextAt(u"Value"), u"2");
+    root.AddLink(root.End(), u"l", u"");
+    EXPECT_FALSE(root.SetTextAt(root.Find(u"l"), u"x"));
+    EXPECT_FALSE(root.SetTextAt(root.End(), u"x"));
+    EXPECT_EQ(root.TextAt(u"l"), nullptr);
+    EXPECT_EQ(root.TextAt(u"missing"), nullptr);
+}
+
+TEST(ResTreeNode, PathsEscapeSlashesAndResolveBack) {
+    ResTreeNode root(u"root", u"Target", false);
+    ResTreeNode* ab = root.AddChild(root.End(), u"a/b", u"Module", false).node;
+    ResTreeNode* leaf = ab->AddChild(ab->End(), u"c\\d", u"IOResource", false).node;
+    EXPECT_EQ(root.Path(), u"/");
+    EXPECT_EQ(ab->Path(), u"/a\\/b");
+    EXPECT_EQ(leaf->Path(), u"/a\\/b/c\\\\d");
+    EXPECT_EQ(root.ResolvePath(ab->Path()), ab);
+    EXPECT_EQ(leaf->ResolvePath(leaf->Path()), leaf);
+    EXPECT_EQ(leaf->ResolvePath(u"../.."), &root);
+    EXPECT_EQ(leaf->ResolvePath(u"./../C\\\\D"), leaf);
+    EXPECT_EQ(root.ResolvePath(u".."), nullptr);
+    EXPECT_EQ(root.ResolvePath(u""), &root);
+    EXPECT_EQ(root.ResolvePath(u"a\\/b/missing"), nullptr);
+}
+
+TEST(ResTreeNode, DocumentRootAnchorNeedsTheAnchorAndMayStandAlone) {
+    ResTreeNode root(u"", u"Target", false);
+    ResTreeNode* doc = root.AddChild(root.End(), u"doc", u"Module", false).node;
+    ResTreeNode* x = doc->AddChild(doc->End(), u"x", u"IOResource", false).node;
+    EXPECT_EQ(x->ResolvePath(u"#{document-root}/x", doc), x);
+    EXPECT_EQ(x->ResolvePath(u"#{Document-Root}", doc), doc);
+    // Without a document root (or with another anchor) the walk starts at the node itself.
+    EXPECT_EQ(doc->ResolvePath(u"#{document-root}/x", nullptr), x);
+    EXPECT_EQ(doc->ResolvePath(u"#{other}/x", x), x);
+    // No closing brace: no anchor, just a name that is not there.
+    EXPECT_EQ(doc->ResolvePath(u"#{document-root", doc), nullptr);
+}
+
+TEST(ResTreeNode, LinksAreFollowedAndLoopsEndInNull) {
+    ResTreeNode root(u"", u"Target", true);
+    ResTreeNode* a = root.AddChild(root.End(), u"A", u"Module", false).node;
+    root.AddLink(root.End(), u"toA", u"A");
+    root.AddLink(root.End(), u"dangling", u"nowhere");
+    root.AddLink(root.End(), u"empty", u"");
+    EXPECT_EQ(root.NodeAt(root.Find(u"toA")), a);
+    EXPECT_EQ(root.ResolvePath(u"toA"), a);
+    EXPECT_EQ(root.NodeAt(root.Find(u"dangling")), nullptr);
+    EXPECT_EQ(root.NodeAt(root.Find(u"empty")), nullptr);
+    // A link that leads to itself, directly or through another link.
+    root.AddLink(root.Begin(), u"self", u"self");
+    root.AddLink(root.End(), u"p", u"q");
+    root.AddLink(root.End(), u"q", u"p");
+    EXPECT_EQ(root.NodeAt(root.Find(u"self")), nullptr);
+    EXPECT_EQ(root.ResolvePath(u"p/x"), nullptr);
+}
+
+TEST(ResTreeNode, ReservedNodesFollowTheListInOrder) {
+    ResTreeNode root(u"", u"Target", false);
+    ResTreeNode* a = root.AddChild(root.End(), u"a", u"IOResource", false).node;
+    ResTreeNode* b = root.AddChild(root.End(), u"b", u"IOResource", false).node;
+    ResTreeNode* user = root.AddChild(root.End(), u"user", u"IOResource", false).node;
+    user->SetText(u"Reserves", u" ../b , ../missing,../a ");
+    EXPECT_EQ(user->ReservedNodes(true), (std::vector<ResTreeNode*>{b, a}));
+    user->RemoveByName(u"Reserves");
+    EXPECT_TRUE(user->ReservedNodes(false).empty());
+}
+
+TEST(ResTreeNode, RemovalEmptiesChildrenFromTheEndAndKeepsTexts) {
+    ResTreeNode root(u"", u"Target", true);
+    root.AddText(root.End(), u"t", u"x");
+    root.AddLink(root.End(), u"l", u"");
+    for (const char16_t* name : {u"a", u"b", u"c"})
+        root.AddChild(root.End(), name, u"Module", false);
+    root.RemoveAllChildren();
+    EXPECT_EQ(Names(root), (std::vector<std::u16string>{u"t", u"l"}));
+    root.RemoveByName(u"absent");
+    EXPECT_FALSE(root.RemoveAt(root.End()));
+    EXPECT_TRUE(root.RemoveAt(root.Find(u"T")));
+    EXPECT_EQ(Names(root), std::vector<std::u16string>{u"l"});
+}
+
+TEST(ResTreeNode, NodesInUseByALoadAreNotRemoved) {
+    ResTreeNode root(u"", u"Target", false);
+    ResTreeNode* a = root.AddChild(root.End(), u"a", u"Module", false).node;
+    ResTreeNode* deep = a->AddChild(a->End(), u"deep", u"Module", false).node;
+    {
+        NodeInUse hold(deep);
+        EXPECT_FALSE(root.RemoveAt(root.Find(u"a")));
+        EXPECT_EQ(ChildOf(root, u"a"), a);
+    }
+    EXPECT_TRUE(root.RemoveAt(root.Find(u"a")));
+    EXPECT_TRUE(root.IsEmpty());
+}
+
+TEST(ResTreeNode, ChangingTheContainerKeepsTheEntries) {
+    ResTreeNode root(u"", u"", false);
+    root.AddText(root.End(), u"b", u"2");
+    root.AddText(root.End(), u"a", u"1");
+    root.SetOrdered(true);
+    root.AddText(root.End(), u"A", u"3");
+    EXPECT_EQ(Names(root), (std::vector<std::u16string>{u"a", u"b", u"A"}));
+    root.SetOrdered(false);
+    EXPECT_EQ(Names(root), (std::vector<std::u16string>{u"a", u"b"}));
+    EXPECT_EQ(TextOf(root, u"a"), u"1");
+}
+
+TEST(TypeRegistry, ListTypesComeFromNamesAndBases) {
+    for (const char16_t* list : {u"ResourceList", u"Target", u"connector", u"Module", u"FooList"})
+        EXPECT_TRUE(IsListType(list)) << std::u16string(list).size();
+    for (const char16_t* plain : {u"Resource", u"IOResource", u"Foo", u"Listing", u""})
+        EXPECT_FALSE(IsListType(plain)) << std::u16string(plain).size();
+}
+
+} // namespace
+} // namespace wbhw

@@ -1,0 +1,180 @@
+// Change delivery: observers, deferral, removal during a pass, watching parents and reservations.
+#include "TreeTestSupport.h"
+#include "resource_tree/ResTreeNode.h"
+
+#include <functional>
+#include <gtest/gtest.h>
+
+namespace wbhw {
+namespace {
+using namespace test;
+
+// Records every delivery; an optional action runs inside the delivery.
+class Recorder : public ResTreeNodeChangeObserver {
+public:
+    struct Call {
+        ResTreeNode* node;
+        uint32_t changes;
+        uint32_t cookie;
+    };
+    std::vector<Call> calls;
+    std::function<void()> during;
+
+    void OnNodeChanged(ResTreeNode* node, uint32_t changes, uint32_t cookie) override {
+        calls.push_back({node, changes, cookie});
+        if (during)
+            during();
+    }
+    uint32_t All() const {
+        uint32_t bits = 0;
+        for (const Call& c : calls)
+            bits |= c.changes;
+        return bits;
+    }
+};
+
+TEST(ResTreeObservers, DisplayNameReachesTheChildAndItsParent) {
+    ResTreeNode root(u"", u"Target", false);
+    ResTreeNode* child = root.AddChild(root.End(), u"c", u"IOResource", false).node;
+    child->SetText(u"DisplayName", u"old");
+    Recorder onChild, onRoot;
+    child->AddObserver(&onChild, kAllChanges, 7);
+    root.AddObserver(&onRoot, kChildDisplayNameChanged, 9);
+    child->SetText(u"displayname", u"new");
+    EXPECT_EQ(onChild.All(), kValueChanged | kDisplayNameChanged);
+    EXPECT_EQ(onChild.calls.front().cookie, 7u);
+    EXPECT_EQ(onChild.calls.front().node, child);
+    ASSERT_EQ(onRoot.calls.size(), 1u);
+    EXPECT_EQ(onRoot.calls[0].changes, kChildDisplayNameChanged);
+
+    // While the parent defers, its observers hear nothing; then one combined delivery.
+    onRoot.calls.clear();
+    root.BeginDeferral();
+    child->SetText(u"DisplayName", u"newer");
+    child->SetText(u"DisplayName", u"newest");
+    root.AddText(root.End(), u"v", u"");
+    EXPECT_TRUE(onRoot.calls.empty());
+    root.EndDeferral();
+    ASSERT_EQ(onRoot.calls.size(), 1u);
+    EXPECT_EQ(onRoot.calls[0].changes, kChildDisplayNameChanged | kValueAdded);
+    // Bits outside an observer's mask are not delivered to it but are not kept either.
+    EXPECT_EQ(root.PendingChanges(), 0u);
+}
+
+TEST(ResTreeObservers, RemovalTellsTheChildBeforeAndAfterItsChildrenGo) {
+    ResTreeNode root(u"", u"Target", false);
+    ResTreeNode* child = root.AddChild(root.End(), u"c", u"Module", false).node;
+    child->AddChild(child->End(), u"g", u"IOResource", false);
+    Recorder onChild, onRoot;
+    std::vector<uint32_t> order;
+    child->AddObserver(&onChild, kAllChanges, 0);
+    onChild.during = [&] { order.push_back(onChild.calls.back().changes); };
+    root.AddObserver(&onRoot, kAllChanges, 0);
+    root.RemoveByName(u"c");
+    EXPECT_EQ(order, (std::vector<uint32_t>{kDetaching, kChildRemoved, kDetached}));
+    EXPECT_EQ(onRoot.All(), kChildRemoved);
+    root.AddText(root.End(), u"t", u"");
+    root.RemoveByName(u"t");
+    EXPECT_EQ(onRoot.All(), kChildRemoved | kValueAdded | kValueRemoved);
+}
+
+TEST(ResTreeObservers, ObserversLeavingOrJoiningDuringAPass) {
+    ResTreeNode node(u"", u"Target", false);
+    Recorder leaver, stayer, joiner;
+    leaver.during = [&] { node.RemoveObserver(&leaver, kAnyCookie); };
+    stayer.during = [&] { node.AddObserver(&joiner, kAllChanges, 3); };
+    node.AddObserver(&leaver, kAllChanges, 1);
+    node.AddObserver(&stayer, kAllChanges, 2);
+    node.AddText(node.End(), u"a", u"");
+    EXPECT_EQ(leaver.calls.size(), 1u);
+    EXPECT_EQ(stayer.calls.size(), 1u);
+    EXPECT_TRUE(joiner.calls.empty()); // joined during the pass: not called in it
+    stayer.during = nullptr;
+    node.AddText(node.End(), u"b", u"");
+    EXPECT_EQ(leaver.calls.size(), 1u);
+    EXPECT_EQ(joiner.calls.size(), 1u);
+}
+
+TEST(ResTreeObservers, ChangesRaisedDuringDeliveryGoOutInAFurtherPass) {
+    ResTreeNode node(u"", u"Target", false);
+    Recorder recorder;
+    recorder.during = [&] {
+        if (recorder.calls.size() == 1)
+            node.AddText(node.End(), u"more", u"");
+    };
+    node.AddObserver(&recorder, kAllChanges, 0);
+    node.AddLink(node.End(), u"l", u"");
+    ASSERT_EQ(recorder.calls.size(), 2u);
+    EXPECT_EQ(recorder.calls[0].changes, kChildAdded);
+    EXPECT_EQ(recorder.calls[1].changes, kValueAdded);
+}
+
+TEST(ResTreeObservers, RemovingByCookie) {
+    ResTreeNode node(u"", u"Target", false);
+    Recorder recorder;
+    node.AddObserver(&recorder, kAllChanges, 1);
+    node.AddObserver(&recorder, kAllChanges, 2);
+    node.RemoveObserver(&recorder, 1);
+    node.AddText(node.End(), u"a", u"");
+    ASSERT_EQ(recorder.calls.size(), 1u);
+    EXPECT_EQ(recorder.calls[0].cookie, 2u);
+}
+
+TEST(ResTreeObservers, AncestorAndReservationChangesAreForwarded) {
+    ResTreeNode root(u"", u"Target", false);
+    ResTreeNode* a = root.AddChild(root.End(), u"a", u"Module", false).node;
+    ResTreeNode* pin = a->AddChild(a->End(), u"pin", u"IOResource", false).node;
+    ResTreeNode* user = root.AddChild(root.End(), u"user", u"IOResource", false).node;
+    user->SetText(u"Reserves", u"../a/pin");
+    Recorder onPin, onUser;
+    pin->AddObserver(&onPin, kAncestorChanged, 0);
+    user->AddObserver(&onUser, kReservationChanged, 0);
+    a->RaiseChanges(kAncestorChanged | kValueAdded);
+    EXPECT_EQ(onPin.All(), kAncestorChanged);
+    pin->RaiseChanges(kReservationChanged);
+    EXPECT_EQ(onUser.All(), kReservationChanged);
+    // Once nobody asks for the bit, the watching stops.
+    pin->RemoveObserver(&onPin, kAnyCookie);
+    onPin.calls.clear();
+    a->RaiseChanges(kAncestorChanged);
+    EXPECT_TRUE(onPin.calls.empty());
+}
+
+TEST(ResTreeObservers, WatchingSurvivesAnyTeardownOrder) {
+    // A node reserving its sibling: deleting either first must leave no stale registration.
+    for (const bool reserverFirst : {true, false}) {
+        auto root = test::NewRoot();
+        root->SetOrdered(true);
+        root->AddChild(root->End(), u"target", u"IOResource", false);
+        ResTreeNode* user = root->AddChild(reserverFirst ? root->Begin() : root->End(), u"user",
+                                           u"IOResource", false)
+                                .node;
+        user->SetText(u"Reserves", u"../target");
+        Recorder onUser;
+        user->AddObserver(&onUser, kReservationChanged, 0);
+        root->RemoveByName(reserverFirst ? u"user" : u"target");
+        root->AddText(root->End(), u"after", u"");
+        root.reset(); // the sanitizers tell if anything was left dangling
+    }
+}
+
+TEST(ResTreeObservers, RingsOfReservationsEndTheirDelivery) {
+    // Two nodes reserving each other, and a node reserving its own parent.
+    ResTreeNode root(u"", u"Target", false);
+    ResTreeNode* a = root.AddChild(root.End(), u"a", u"IOResource", false).node;
+    ResTreeNode* b = root.AddChild(root.End(), u"b", u"IOResource", false).node;
+    a->SetText(u"Reserves", u"../b");
+    b->SetText(u"Reserves", u"../a");
+    ResTreeNode* inner = a->AddChild(a->End(), u"inner", u"IOResource", false).node;
+    inner->SetText(u"Reserves", u"..");
+    Recorder onA, onInner;
+    a->AddObserver(&onA, kReservationChanged, 0);
+    inner->AddObserver(&onInner, kAncestorChanged | kReservationChanged, 0);
+    b->RaiseChanges(kReservationChanged);
+    EXPECT_EQ(onA.All(), kReservationChanged);
+    EXPECT_LT(onA.calls.size(), 4u);
+    EXPECT_NE(onInner.All() & kReservationChanged, 0u);
+}
+
+} // namespace
+} // namespace wbhw
