@@ -37,7 +37,9 @@ public:
     bool Lock(uint32_t timeoutMs = 0xFFFFFFFFu) override;
     bool Unlock() override;
 
+    // Lock() under the name std::lock_guard looks for.
     void lock() { Lock(); }
+    // Unlock() under the name std::lock_guard looks for.
     void unlock() { Unlock(); }
 
 private:
