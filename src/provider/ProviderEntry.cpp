@@ -1,0 +1,52 @@
+// qxGetProvider's rules for the current and private providers.
+#include "provider/ProviderEntry.h"
+
+#include "framework/CqxProviderList.h"
+#include "framework/com/CallGuard.h"
+#include "framework/com/ComObject.h"
+#include "framework/com/ComPtr.h"
+#include "provider/TIOProvider.h"
+
+#include <mutex>
+
+namespace tio {
+
+namespace {
+
+std::mutex& ProviderLock() {
+    static std::mutex lock;
+    return lock;
+}
+
+HRESULT CreateProvider(bool makeCurrent, void** provider) {
+    CQVComObject<TIOProvider>* raw = nullptr;
+    const HRESULT hr = CQVComObject<TIOProvider>::CreateInstance(&raw);
+    if (FAILED(hr)) {
+        return hr;
+    }
+    // Holds the creation reference; the caller keeps the one the query adds.
+    const auto created = qv::com::ComPtr<CQVComObject<TIOProvider>>::Adopt(raw);
+    CqxProviderList::Module().Add(raw, makeCurrent);
+    return raw->QueryInterface(IqxProvider::iid, provider);
+}
+
+} // namespace
+
+HRESULT GetProvider(int32_t mode, void** provider) {
+    const std::lock_guard guard(ProviderLock());
+    if (!provider) {
+        return E_POINTER;
+    }
+    *provider = nullptr;
+    return qv::com::GuardCall([&] {
+        if (mode != 0) {
+            return CreateProvider(false, provider);
+        }
+        if (const auto current = CqxProviderList::Module().Current()) {
+            return current->QueryInterface(IqxProvider::iid, provider);
+        }
+        return CreateProvider(true, provider);
+    });
+}
+
+} // namespace tio

@@ -1,0 +1,83 @@
+// The provider's overrides of the framework base, and its project attachment.
+#include "provider/TIOProvider.h"
+
+#include "framework/IqxProjectItemValidator.h"
+#include "framework/com/ComInit.h"
+#include "provider/TIOIdentifiers.h"
+#include "provider/TIOItemRegistry.h"
+#include "provider/TIOModule.h"
+#include "provider/TIOStrings.h"
+
+using qv::com::ComPtr;
+
+HRESULT TIOProvider::Initialize(IUnknown* site) {
+    const HRESULT hr = CqxProvider::Initialize(site);
+    projectRoot_ = ProjectRoot();
+    tio::ModuleInstance();
+    return hr;
+}
+
+HRESULT TIOProvider::CreateItemHook(const CqxItemRequest& request, IUnknown** item) {
+    return tio::ItemRegistry().Create(request, item);
+}
+
+HRESULT TIOProvider::ValidateCandidateHook(IUnknown* candidate) {
+    if (!candidate) {
+        return S_FALSE;
+    }
+    const auto validator = qv::com::QueryAs<IqxProjectItemValidator>(candidate);
+    if (!validator) {
+        return S_FALSE;
+    }
+    auto* self = static_cast<IUnknown*>(static_cast<IqxProvider*>(this));
+    return validator->ValidateAgainst(self) == S_OK ? S_OK : S_FALSE;
+}
+
+void TIOProvider::ListItemTypesHook(std::vector<GUID>& types) {
+    tio::ItemRegistry().ListTypes(types);
+}
+
+void TIOProvider::ListParentTypesHook(std::vector<GUID>& types) {
+    tio::ItemRegistry().ListParentTypes(types);
+}
+
+HRESULT TIOProvider::TypeNameHook(const GUID& type, BSTR* name) {
+    return tio::ItemRegistry().TypeName(type, tio::LoadModuleString, name);
+}
+
+CLSID TIOProvider::ClassIdHook() {
+    return tio::kProviderClassId;
+}
+
+HRESULT TIOProvider::AttachTo(IUnknown* project) {
+    CoInitialize(nullptr);
+    // Share before dropping the old one: attaching the same project again must not free it.
+    host_ = ComPtr<IUnknown>::Share(project);
+    return S_OK;
+}
+
+HRESULT TIOProvider::Attach(IUnknown* project) {
+    return AttachTo(project);
+}
+
+HRESULT TIOProvider::AttachReloaded(IUnknown* project) {
+    return AttachTo(project);
+}
+
+HRESULT TIOProvider::ProjectReady() {
+    return S_OK;
+}
+
+HRESULT TIOProvider::Detach() {
+    host_.Reset();
+    CoUninitialize();
+    return S_OK;
+}
+
+HRESULT TIOProvider::ProjectSaving() {
+    return S_OK;
+}
+
+HRESULT TIOProvider::ProjectSaved() {
+    return S_OK;
+}

@@ -1,0 +1,50 @@
+// The Tangent I/O provider: the object through which the project framework learns what the
+// plug-in offers, creates its items and attaches it to the host's project.
+#pragma once
+
+#include "framework/CqxProvider.h"
+#include "framework/com/ComPtr.h"
+#include "host/contracts/IwbProjectProvider.h"
+
+class TIOProvider : public CqxProvider, public IwbProjectProvider {
+public:
+    using Interfaces = CqxProvider::Interfaces::Append<IwbProjectProvider>;
+
+    // Runs the base initialisation, keeps the framework's root object and records the module
+    // handle; answers the base's result.
+    HRESULT Initialize(IUnknown* site) override;
+
+    // IwbProjectProvider: both attach operations take a reference on PROJECT and drop the one
+    // held before; Detach drops it. Every operation answers S_OK.
+    HRESULT Attach(IUnknown* project) override;
+    HRESULT AttachReloaded(IUnknown* project) override;
+    HRESULT ProjectReady() override;
+    HRESULT Detach() override;
+    HRESULT ProjectSaving() override;
+    HRESULT ProjectSaved() override;
+
+    // The framework's root object kept at initialisation (no reference added); null before.
+    IUnknown* projectRoot() const { return projectRoot_; }
+    // The host's project object held since the last attach; null when detached.
+    IUnknown* host() const { return host_.Get(); }
+
+protected:
+    TIOProvider() = default;
+    ~TIOProvider() override = default;
+
+    HRESULT CreateItemHook(const CqxItemRequest& request, IUnknown** item) override;
+    // Null answers S_FALSE; otherwise the candidate's own check against this provider decides.
+    HRESULT ValidateCandidateHook(IUnknown* candidate) override;
+    void ListItemTypesHook(std::vector<GUID>& types) override;
+    void ListParentTypesHook(std::vector<GUID>& types) override;
+    HRESULT TypeNameHook(const GUID& type, BSTR* name) override;
+    CLSID ClassIdHook() override;
+
+private:
+    HRESULT AttachTo(IUnknown* project);
+
+    // The root object lives as long as the framework that initialised us; the base holds the
+    // reference.
+    IUnknown* projectRoot_ = nullptr;
+    qv::com::ComPtr<IUnknown> host_;
+};
