@@ -34,9 +34,10 @@ using ConverterPtr = std::unique_ptr<UConverter, ConverterCloser>;
     QV_THROW(osdep::WinError(badText ? kNoUnicodeTranslation : kInvalidParameter));
 }
 
-// True when the name came from the environment rather than from the fixed list.
+// True when the converter name comes from the environment rather than from the fixed list.
 bool IsConfiguredName(std::string_view codePage) {
-    return codePage.empty();
+    const char* configured = std::getenv(kCodePageVariable);
+    return codePage.empty() && configured != nullptr && *configured != '\0';
 }
 
 ConverterPtr OpenConverter(const std::string& name, bool configured) {
