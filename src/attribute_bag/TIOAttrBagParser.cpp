@@ -2,8 +2,8 @@
 #include "attribute_bag/TIOAttrBagParser.h"
 
 #include "attribute_bag/TIOAttrBag.h"
-#include "attribute_bag/XmlText.h"
 #include "kern/Collate.h"
+#include "resource_tree/ListText.h"
 
 #include <memory>
 

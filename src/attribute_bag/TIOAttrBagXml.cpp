@@ -3,6 +3,7 @@
 #include "attribute_bag/TIOAttrBagParser.h"
 #include "attribute_bag/WBAttrClusterParser.h"
 #include "attribute_bag/XmlText.h"
+#include "resource_tree/ListText.h"
 
 void TIOAttrBag::WriteXml(std::u16string& out, std::u16string_view indent) const {
     std::u16string inner(indent);

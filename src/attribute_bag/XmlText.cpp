@@ -43,10 +43,6 @@ void AppendEscaped(char16_t c, bool attribute, std::u16string& out) {
     out += c;
 }
 
-bool IsBlank(char16_t c) noexcept {
-    return c == u' ' || c == u'\t' || c == u'\r' || c == u'\n';
-}
-
 // True for a UTF-16 unit that XML 1.0 forbids everywhere, even as a character reference.
 bool IsForbiddenInXml(char16_t c) noexcept {
     if (c < 0x20)
@@ -86,16 +82,6 @@ void AppendEscapedText(std::u16string_view text, std::u16string& out) {
 void AppendEscapedAttribute(std::u16string_view text, std::u16string& out) {
     for (const char16_t c : text)
         AppendEscaped(c, true, out);
-}
-
-std::u16string_view TrimBlanks(std::u16string_view text) noexcept {
-    size_t first = 0;
-    size_t last = text.size();
-    while (first < last && IsBlank(text[first]))
-        ++first;
-    while (last > first && IsBlank(text[last - 1]))
-        --last;
-    return text.substr(first, last - first);
 }
 
 std::string ToXmlUtf8Lenient(std::u16string_view wide) {

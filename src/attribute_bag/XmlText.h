@@ -18,9 +18,6 @@ void AppendEscapedText(std::u16string_view text, std::u16string& out);
 // and line feed as references, since a reader would end the value there or turn them into blanks.
 void AppendEscapedAttribute(std::u16string_view text, std::u16string& out);
 
-// TEXT without leading and trailing blanks (space, tab, carriage return, line feed).
-std::u16string_view TrimBlanks(std::u16string_view text) noexcept;
-
 // UTF-8 for an XML reader: surrogate pairs become one four-byte sequence, while unpaired
 // surrogates and the characters that XML cannot carry at all (controls other than tab, line feed
 // and carriage return; U+FFFE; U+FFFF) become "?".

@@ -1,8 +1,8 @@
 // The attribute bag's XML text: exact bytes, the reader's rules, and the round trip.
 #include "RandomText.h"
 #include "attribute_bag/TIOAttrBag.h"
-#include "attribute_bag/XmlText.h"
 #include "kern/Collate.h"
+#include "resource_tree/ListText.h"
 
 #include <gtest/gtest.h>
 #include <random>
