@@ -9,7 +9,9 @@ namespace test {
 
 class LoadedModule {
 public:
-    LoadedModule() : handle_(dlopen(WBT_MODULE_PATH, RTLD_NOW | RTLD_LOCAL)) {}
+    // NODELETE: the libraries the module brings (ICU) keep process-wide caches that are meant to
+    // live as long as the process, as they do in a host, which keeps its plug-ins mapped.
+    LoadedModule() : handle_(dlopen(WBT_MODULE_PATH, RTLD_NOW | RTLD_LOCAL | RTLD_NODELETE)) {}
     ~LoadedModule() {
         if (handle_ != nullptr)
             dlclose(handle_);
