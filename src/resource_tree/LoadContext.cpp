@@ -6,12 +6,19 @@
 #include "resource_tree/TypeRegistry.h"
 
 #include <array>
+#include <mutex>
 #include <utility>
 
 namespace wbhw {
 namespace {
 
 thread_local LoadContext* current = nullptr;
+
+std::mutex defaultsLock;
+LoaderSettings& Defaults() {
+    static LoaderSettings defaults;
+    return defaults;
+}
 
 constexpr std::array<std::pair<std::u16string_view, LoaderAttribute>, 10> kAttributes{{
     {u"name", LoaderAttribute::Name},
@@ -27,6 +34,16 @@ constexpr std::array<std::pair<std::u16string_view, LoaderAttribute>, 10> kAttri
 }};
 
 } // namespace
+
+LoaderSettings DefaultLoaderSettings() {
+    const std::lock_guard<std::mutex> hold(defaultsLock);
+    return Defaults();
+}
+
+void SetDefaultLoaderSettings(const LoaderSettings& settings) {
+    const std::lock_guard<std::mutex> hold(defaultsLock);
+    Defaults() = settings;
+}
 
 const TagInfo& LoadContext::ClassifyTag(const std::u16string& tag) {
     const auto found = tags.find(tag);
@@ -61,8 +78,7 @@ LoadScope::LoadScope(const LoaderSettings* settings, bool isLoad)
     if (context_ == nullptr) {
         owned_ = std::make_unique<LoadContext>();
         context_ = owned_.get();
-        if (settings != nullptr)
-            context_->settings = *settings;
+        context_->settings = settings != nullptr ? *settings : DefaultLoaderSettings();
         context_->language = context_->settings.language.empty() ? qv::host::UserInterfaceLanguage()
                                                                  : context_->settings.language;
         current = context_;

@@ -25,4 +25,10 @@ struct LoaderSettings {
     size_t maxEntries = 16u * 1024u * 1024u;
 };
 
+// The settings of loads started without settings of their own (including deferred loads that a
+// lookup starts outside any load). Thread-safe.
+LoaderSettings DefaultLoaderSettings();
+// Replaces the default settings (the embedded host sets its directories and language here).
+void SetDefaultLoaderSettings(const LoaderSettings& settings);
+
 } // namespace wbhw

@@ -195,8 +195,9 @@ void ParseStack::CountEntry(ResTreeNode& node) {
                     DecimalText(context_.settings.maxEntries) + u" entries.");
 }
 
-void ParseStack::Abort(ResTreeNode& node, std::u16string_view message) {
-    AddError(node, message);
+void ParseStack::Abort(ResTreeNode& /*at*/, std::u16string_view message) {
+    // A stopped load is the load's problem: the message goes where syntax errors go.
+    AddError(*frames_[0]->node, message);
     throw LoadAborted{};
 }
 

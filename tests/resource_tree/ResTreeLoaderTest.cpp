@@ -1,0 +1,135 @@
+// Loading files in blocks, includes and deferred files, and the limits on nested loads.
+#include "TreeTestSupport.h"
+#include "resource_tree/LoaderText.h"
+#include "resource_tree/ResTreeNode.h"
+
+#include <gtest/gtest.h>
+
+namespace wbhw {
+namespace {
+using namespace test;
+
+constexpr int32_t kFail = static_cast<int32_t>(0x80004005u);
+
+// A document whose entries run across several 4096-byte blocks, with multibyte characters and
+// an element name cut at every offset near a block boundary depending on PAD.
+std::string BlockDocument(size_t pad, size_t items) {
+    std::string doc = "<Top>\n<Pad>" + std::string(pad, 'p') + "</Pad>\n";
+    for (size_t i = 0; i < items; ++i) {
+        doc += "<IOResource name=\"R" + std::to_string(i) + "\"><Label>\xC3\xA9t\xC3\xA9 " +
+               std::to_string(i) + "</Label><Direction>in</Direction></IOResource>\n";
+    }
+    return doc + "</Top>\n";
+}
+
+TEST(ResTreeLoader, FilesLoadAlikeWhereverTheBlocksEnd) {
+    ScratchDirectory dir;
+    for (size_t pad = 4000; pad < 4100; pad += 7) {
+        const std::string bytes = BlockDocument(pad, 150);
+        const std::string file = dir.Write("doc.xml", bytes);
+        auto fromFile = NewRoot();
+        ASSERT_EQ(fromFile->ParseFile(file, false), 0) << pad;
+        auto fromText = Load(FromUtf8Lenient(bytes));
+        ASSERT_EQ(fromFile->EntryCount(), 151u);
+        EXPECT_EQ(TextOf(*ChildOf(*fromFile, u"R149"), u"Label"), u"\u00E9t\u00E9 149");
+        EXPECT_EQ(TextOf(*ChildOf(*fromText, u"R77"), u"Label"), u"\u00E9t\u00E9 77");
+    }
+    // A file of exactly one block ends with an empty final block.
+    std::string exact = "<Top><V>";
+    exact += std::string(4096 - exact.size() - 11, 'x') + "</V></Top>\n";
+    ASSERT_EQ(exact.size(), 4096u);
+    auto root = NewRoot();
+    EXPECT_EQ(root->ParseFile(dir.Write("exact.xml", exact), false), 0);
+    EXPECT_EQ(TextOf(*root, u"V").size(), 4096u - 8 - 11);
+}
+
+TEST(ResTreeLoader, FileErrorsNameTheFile) {
+    ScratchDirectory dir;
+    auto root = NewRoot();
+    EXPECT_EQ(root->ParseFile(dir.path() + "/missing.xml", false), kFail);
+    EXPECT_EQ(root->Find(u"XMLParseErrors"), root->End());
+    EXPECT_EQ(root->ParseFile(dir.path(), false), kFail); // a directory is no document
+    const std::string bad = dir.Write("bad.xml", std::string(5000, ' ') + "\n<Top>\n<A>\n</B>\n");
+    EXPECT_EQ(root->ParseFile(bad, false), kFail);
+    EXPECT_EQ(TextOf(*root, u"XMLParseErrors"), u"Error on line 4 at column 2 of file " +
+                                                    FromUtf8Lenient(bad) +
+                                                    u"\n   mismatched tag\n   \n<A>\n</B>\n\n");
+}
+
+TEST(ResTreeLoader, IncludesLoadAsAChildOrIntoTheNode) {
+    ScratchDirectory dir;
+    dir.Write("child.xml", "<Module name='inc'><Where>#{site}</Where></Module>");
+    dir.Write("children.xml", "<Anything><Merged>yes</Merged></Anything>");
+    LoaderSettings settings;
+    settings.includeDirectory = dir.path();
+    auto root = Load(uR"(<Top site="lab">
+        <:Include>child.xml</:Include>
+        <:Include what="children">./children.xml</:Include>
+        <:Include>missing.xml</:Include>
+    </Top>)",
+                     &settings);
+    ResTreeNode* inc = ChildOf(*root, u"inc");
+    ASSERT_NE(inc, nullptr);
+    EXPECT_EQ(TextOf(*inc, u"Where"), u"lab");
+    EXPECT_EQ(TextOf(*root, u"Merged"), u"yes");
+    EXPECT_EQ(root->Type(), u"Top");
+    EXPECT_NE(TextOf(*root, u"XMLParseErrors")
+                  .find(u"Unable to find include file node: " + FromUtf8Lenient(dir.path()) +
+                        u"/missing.xml"),
+              std::u16string::npos);
+}
+
+TEST(ResTreeLoader, IncludesThatComeBackAroundStopWithAMessage) {
+    ScratchDirectory dir;
+    dir.Write("a.xml", "<A><:Include what='children'>b.xml</:Include></A>");
+    dir.Write("b.xml", "<B><:Include what='children'>a.xml</:Include></B>");
+    LoaderSettings settings;
+    settings.includeDirectory = dir.path();
+    settings.maxNestedLoads = 8;
+    int32_t result = -1;
+    auto root = Load(u"<Top><:Include what='children'>a.xml</:Include></Top>", &settings, &result);
+    EXPECT_EQ(result, 0);
+    EXPECT_NE(TextOf(*root, u"XMLParseErrors").find(u"Loads are nested deeper than 8 levels"),
+              std::u16string::npos);
+}
+
+TEST(ResTreeLoader, DeferredFilesLoadOnTheFirstMissOnce) {
+    ScratchDirectory dir;
+    dir.Write("late.xml", "<Module><Group name='Late'/></Module>");
+    dir.Write("parent.xml", "<Top><FromParent>p</FromParent></Top>");
+    LoaderSettings settings;
+    settings.deferredDirectory = dir.path();
+    // The link's lookup misses in m and loads m's files: late.xml, then the parent's, then
+    // missing.xml fails and never.xml is not tried.
+    auto root = Load(uR"(<Top>
+        <:DeferredLoadPath>parent.xml</:DeferredLoadPath>
+        <Group name="m"><:DeferredLoadPath>late.xml, .., missing.xml, never.xml</:DeferredLoadPath></Group>
+        <:Link name="l">m/Late</:Link>
+    </Top>)",
+                     &settings);
+    ResTreeNode* m = ChildOf(*root, u"m");
+    ASSERT_NE(m, nullptr);
+    EXPECT_NE(ChildOf(*m, u"Late"), nullptr);
+    EXPECT_EQ(root->Find(u"l")->Kind(), EntryKind::Link);
+    EXPECT_EQ(TextOf(*root, u"FromParent"), u"p");
+    EXPECT_EQ(m->Find(u":DeferredLoadPath"), m->End());
+    EXPECT_EQ(root->Find(u":DeferredLoadPath"), root->End());
+    EXPECT_EQ(m->LoadDeferred(), 0);
+}
+
+TEST(ResTreeLoader, LookupsOutsideALoadUseTheDefaultSettings) {
+    ScratchDirectory dir;
+    dir.Write("late.xml", "<Module><Late>1</Late></Module>");
+    const LoaderSettings saved = DefaultLoaderSettings();
+    LoaderSettings settings = saved;
+    settings.deferredDirectory = dir.path();
+    SetDefaultLoaderSettings(settings);
+    ResTreeNode root(u"", u"Module", false);
+    root.SetText(u":DeferredLoadPath", u"late.xml");
+    EXPECT_EQ(root.Find(u"Late"), root.End());
+    EXPECT_EQ(*root.TextAt(u"Late"), u"1");
+    SetDefaultLoaderSettings(saved);
+}
+
+} // namespace
+} // namespace wbhw
