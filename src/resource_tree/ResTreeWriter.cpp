@@ -8,6 +8,7 @@
 #include "resource_tree/LoaderText.h"
 #include "resource_tree/TypeRegistry.h"
 
+#include <map>
 #include <unordered_set>
 #include <vector>
 
@@ -171,14 +172,28 @@ private:
             out_ += u"/>\n";
         } else {
             out_ += u">\n";
-            for (ResTreePosition at = node.Begin(); at != node.End(); ++at)
+            // Loading removes an earlier entry of a node's name unless it is a child of the same
+            // type and order, so in an ordered node only such repeats can come back.
+            std::map<std::u16string_view, const ResTreeEntry*, qv::kern::LessNoCase> first;
+            for (ResTreePosition at = node.Begin(); at != node.End(); ++at) {
+                const auto [seen, isFirst] = first.emplace(at->Name(), &*at);
+                if (!isFirst && at->Kind() == EntryKind::Child && !SameShape(*seen->second, *at))
+                    faithful_ = false;
                 WriteEntry(node, *at, depth + 1);
+            }
             Indent(depth);
             out_ += u"</";
             out_ += type;
             out_ += u">\n";
         }
         scope_.resize(scopeSize);
+    }
+
+    static bool SameShape(const ResTreeEntry& earlier, const ResTreeEntry& later) {
+        const ResTreeNode* a = earlier.Child();
+        const ResTreeNode* b = later.Child();
+        return a != nullptr && b != nullptr && qv::kern::EqualsNoCase(a->Type(), b->Type()) &&
+               a->IsOrdered() == b->IsOrdered();
     }
 
     void WriteEntry(const ResTreeNode& holder, const ResTreeEntry& entry, int depth) {
@@ -189,7 +204,7 @@ private:
             return;
         case EntryKind::Text:
         case EntryKind::LocalizedText:
-            WriteText(entry, depth);
+            WriteText(holder, entry, depth);
             return;
         case EntryKind::Link:
             WriteLink(holder, entry, depth);
@@ -200,11 +215,16 @@ private:
         }
     }
 
-    void WriteText(const ResTreeEntry& entry, int depth) {
+    void WriteText(const ResTreeNode& holder, const ResTreeEntry& entry, int depth) {
         const std::u16string_view name = entry.Name();
         const TagInfo& tag = tags_.ClassifyTag(std::u16string(name));
-        if (!IsElementName(name) || tag.isLink || tag.isInclude)
+        if (!IsElementName(name) || tag.isLink || tag.isInclude) {
+            // No element can carry this name as a text, but a link that does not resolve
+            // becomes exactly such a text, under any name.
+            if (WriteUnresolvedLink(holder, entry, depth))
+                return;
             faithful_ = false;
+        }
         std::u16string_view value = *entry.Text();
         const bool localized = entry.Kind() == EntryKind::LocalizedText;
         if (localized) {
@@ -275,6 +295,31 @@ private:
         return current;
     }
 
+    bool WriteUnresolvedLink(const ResTreeNode& holder, const ResTreeEntry& entry, int depth) {
+        constexpr std::u16string_view kUnresolved = u"UNRESOLVED LINK: ";
+        const std::u16string_view value = *entry.Text();
+        if (entry.Kind() != EntryKind::Text || value.substr(0, kUnresolved.size()) != kUnresolved)
+            return false;
+        const std::u16string_view path = value.substr(kUnresolved.size());
+        if (Resolve(&holder, path, 0) != nullptr)
+            return false;
+        LinkElement(entry.Name(), path, depth);
+        return true;
+    }
+
+    void LinkElement(std::u16string_view name, std::u16string_view path, int depth) {
+        Indent(depth);
+        out_ += u"<:Link";
+        const size_t scopeSize = scope_.size();
+        Attribute(u"name", name);
+        if (TrimBlanks(path).size() != path.size())
+            Attribute(u"xml:space", u"preserve");
+        out_ += u'>';
+        Escaped(path, false);
+        out_ += u"</:Link>\n";
+        scope_.resize(scopeSize);
+    }
+
     void WriteLink(const ResTreeNode& holder, const ResTreeEntry& entry, int depth) {
         const std::u16string_view path = *entry.Text();
         const ResTreeNode* target = Resolve(&holder, path, 0);
@@ -283,16 +328,7 @@ private:
         if (target == nullptr || !started_.contains(target) ||
             RelativeResourcePath(holder.Path(), target->Path()) != path)
             faithful_ = false;
-        Indent(depth);
-        out_ += u"<:Link";
-        const size_t scopeSize = scope_.size();
-        Attribute(u"name", entry.Name());
-        if (TrimBlanks(path).size() != path.size())
-            Attribute(u"xml:space", u"preserve");
-        out_ += u'>';
-        Escaped(path, false);
-        out_ += u"</:Link>\n";
-        scope_.resize(scopeSize);
+        LinkElement(entry.Name(), path, depth);
     }
 
     const ResTreeNode& root_;
