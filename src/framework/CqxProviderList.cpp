@@ -6,17 +6,29 @@
 #include "framework/CqxProvider.h"
 
 #include <algorithm>
+#include <new>
+
+namespace {
+// Frees the list's storage when the module's statics are torn down (the module may be unloaded
+// and its memory unmapped afterwards).
+struct StorageReleaser {
+    ~StorageReleaser() { CqxProviderList::Module().ReleaseStorage(); }
+};
+} // namespace
 
 CqxProviderList& CqxProviderList::Module() {
-    // Never destroyed: providers still held by the host when the module's statics are torn down
-    // leave the list as they die.
-    union Holder {
-        Holder() : list() {}
-        ~Holder() {}
-        CqxProviderList list;
-    };
-    static Holder holder;
-    return holder.list;
+    // The list itself is never destroyed: a provider that the host still holds when the statics
+    // are torn down can leave it as it dies.
+    alignas(CqxProviderList) static unsigned char storage[sizeof(CqxProviderList)];
+    static CqxProviderList* const list = new (storage) CqxProviderList();
+    static const StorageReleaser releaser;
+    return *list;
+}
+
+void CqxProviderList::ReleaseStorage() noexcept {
+    const std::lock_guard guard(lock_);
+    std::vector<CqxProvider*>().swap(providers_);
+    current_ = nullptr;
 }
 
 void CqxProviderList::Add(CqxProvider* provider, bool makeCurrent) {

@@ -27,6 +27,8 @@ public:
     size_t Size() const;
     // Whether PROVIDER is recorded and is the current provider.
     bool IsCurrent(const CqxProvider* provider) const;
+    // Forgets every provider and frees the storage (when the module is torn down).
+    void ReleaseStorage() noexcept;
 
 private:
     mutable std::mutex lock_;
