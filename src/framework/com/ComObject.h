@@ -77,6 +77,7 @@ public:
         return S_OK;
     }
 
+    // Answers T's interfaces (its list, then QueryOtherInterface) with a reference.
     HRESULT QueryInterface(const IID& iid, void** object) {
         if (!object) {
             return E_POINTER;
@@ -88,7 +89,9 @@ public:
         AddRef();
         return S_OK;
     }
+    // Adds a reference; answers the new count.
     uint32_t AddRef() { return refs_.fetch_add(1, std::memory_order_relaxed) + 1; }
+    // Drops a reference and deletes the object at zero; answers the new count.
     uint32_t Release() {
         const uint32_t left = refs_.fetch_sub(1, std::memory_order_acq_rel) - 1;
         if (left == 0) {
@@ -123,6 +126,7 @@ public:
     CQVComContainedObject(const CQVComContainedObject&) = delete;
     CQVComContainedObject& operator=(const CQVComContainedObject&) = delete;
 
+    // Every IUnknown call is the outer object's.
     HRESULT QueryInterface(const IID& iid, void** object) {
         return outer_->QueryInterface(iid, object);
     }
