@@ -14,13 +14,15 @@ namespace {
 std::atomic<void*> runtimeModule{nullptr};
 std::atomic<uint32_t> runtimeTlsIndex{kNoRuntimeTlsIndex};
 
+// The executable is never unloaded and its own exports never change, so this is decided once.
 void* MainModuleIfRuntime() noexcept {
-    void* const main = kern::osdep::MainModule();
-    if (kern::osdep::ModuleExport(main, "gWBRTVersion") != nullptr ||
-        kern::osdep::ModuleExport(main, "AZNewHandle") != nullptr) {
-        return main;
-    }
-    return nullptr;
+    static void* const runtime = [] {
+        void* const main = kern::osdep::MainModule();
+        const bool exports = kern::osdep::ModuleExport(main, "gWBRTVersion") != nullptr ||
+                             kern::osdep::ModuleExport(main, "AZNewHandle") != nullptr;
+        return exports ? main : nullptr;
+    }();
+    return runtime;
 }
 
 } // namespace

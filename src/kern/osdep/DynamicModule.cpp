@@ -163,8 +163,14 @@ bool IsModuleLoaded(const void* handle) noexcept {
 }
 
 uint64_t ModuleStamp(const void* handle) noexcept {
-    const uint32_t prefix = Probe(handle, true).buildId;
-    return prefix != 0 ? prefix : 1;
+    auto stampOf = [](const void* module) -> uint64_t {
+        const uint32_t prefix = Probe(module, true).buildId;
+        return prefix != 0 ? prefix : 1;
+    };
+    // The executable never goes away, so its stamp cannot change: the common case of a host that
+    // is itself the runtime skips the walk.
+    static const uint64_t mainStamp = stampOf(MainModule());
+    return handle == MainModule() ? mainStamp : stampOf(handle);
 }
 
 void* ModuleExport(void* handle, const char* name) noexcept {
