@@ -16,6 +16,7 @@ TIOAttrBagParser::TIOAttrBagParser(TIOAttrBag& target, TIOAttrBag** lastSet)
 }
 
 void TIOAttrBagParser::Enter(TIOAttrBag& set) {
+    ++depth_;
     current_ = &set;
     if (lastSet_ != nullptr)
         *lastSet_ = &set;
@@ -50,6 +51,10 @@ void TIOAttrBagParser::StartTopSet(const wbhw::XmlAttributes& attributes) {
 }
 
 void TIOAttrBagParser::StartNestedSet(const wbhw::XmlAttributes& attributes) {
+    if (depth_ >= kMaxNesting) {
+        state_ = State::kFailed;
+        return;
+    }
     auto set = std::make_unique<TIOAttrBag>(std::u16string(attributes.Get(u"name")));
     const auto [adopted, inserted] = current_->AdoptChild(set);
     if (!inserted) {
@@ -106,6 +111,7 @@ void TIOAttrBagParser::EndElement(const std::u16string& element) {
             state_ = State::kFailed;
             return;
         }
+        --depth_;
         current_ = current_->Parent();
         state_ = current_ == nullptr ? State::kTop : State::kInside;
         return;

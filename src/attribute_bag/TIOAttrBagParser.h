@@ -12,6 +12,11 @@ class TIOAttrBag;
 // state, after which every event is ignored; what was read before stays in the tree.
 class TIOAttrBagParser : public wbhw::ExPatHandler {
 public:
+    // Deepest nesting of AttributeSet elements read; deeper documents fail. Real bags are a few
+    // levels deep, and a hostile depth would otherwise exhaust the stack of every recursive walk
+    // of the tree (and the indentation of its text grows with the square of the depth).
+    static constexpr int kMaxNesting = 256;
+
     // Reads into TARGET; LASTSET (when given) is set to TARGET now and to each set opened later.
     TIOAttrBagParser(TIOAttrBag& target, TIOAttrBag** lastSet);
 
@@ -34,6 +39,7 @@ private:
     void Enter(TIOAttrBag& set);
 
     TIOAttrBag* current_;
+    int depth_ = 0;
     TIOAttrBag** lastSet_;
     std::u16string attributeName_;
     std::u16string text_;

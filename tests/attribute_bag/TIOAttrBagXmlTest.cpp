@@ -1,6 +1,7 @@
 // The attribute bag's XML text: exact bytes, the reader's rules, and the round trip.
 #include "RandomText.h"
 #include "attribute_bag/TIOAttrBag.h"
+#include "attribute_bag/TIOAttrBagParser.h"
 #include "kern/Collate.h"
 #include "resource_tree/ListText.h"
 
@@ -87,6 +88,21 @@ TEST(AttrBagXml, RejectsUnexpectedDocumentsButKeepsWhatWasRead) {
                                   target),
               kFail);
     EXPECT_EQ(target.GetValue(u"kept"), u"k");
+}
+
+TEST(AttrBagXml, NestingIsBounded) {
+    auto nested = [](int depth) {
+        std::u16string doc;
+        for (int i = 0; i < depth; ++i)
+            doc += u"<AttributeSet name='s'>";
+        for (int i = 0; i < depth; ++i)
+            doc += u"</AttributeSet>";
+        return doc;
+    };
+    TIOAttrBag deepest;
+    EXPECT_EQ(TIOAttrBag::ReadXml(nested(TIOAttrBagParser::kMaxNesting), deepest), 0);
+    TIOAttrBag tooDeep;
+    EXPECT_EQ(TIOAttrBag::ReadXml(nested(100000), tooDeep), kFail);
 }
 
 TEST(AttrBagXml, OneUnencodableCharacterDoesNotLoseTheBag) {
