@@ -8,6 +8,7 @@
 #include <dlfcn.h>
 #include <gtest/gtest.h>
 #include <pthread.h>
+#include <set>
 #include <stdexcept>
 #include <string>
 #include <thread>
@@ -94,6 +95,35 @@ TEST_F(HostFunctionTest, ThreadSlotDecidesOnlyWhenItHoldsAModule) {
     EXPECT_EQ(otherThread, 1) << "the slot is per thread";
     pthread_setspecific(key, nullptr);
     pthread_key_delete(key);
+}
+
+TEST_F(HostFunctionTest, ThreadsOfDifferentModulesClaimDifferentEntries) {
+    static rt::BoundFunction<AnswerFn> answer{"FakeAnswer"};
+    ClearCache(answer);
+    const auto fakes = LoadFakes(1, 8);
+    pthread_key_t key;
+    ASSERT_EQ(pthread_key_create(&key, nullptr), 0);
+    rt::SetRuntimeTlsIndex(static_cast<uint32_t>(key));
+    std::vector<int32_t> wrong(fakes.size(), 0);
+    std::vector<std::thread> threads;
+    for (size_t t = 0; t < fakes.size(); ++t) {
+        threads.emplace_back([&, t] {
+            pthread_setspecific(key, fakes[t].handle());
+            for (int i = 0; i < 2000; ++i) {
+                wrong[t] += answer() != static_cast<int32_t>(t + 1);
+            }
+        });
+    }
+    for (std::thread& thread : threads) {
+        thread.join();
+    }
+    pthread_key_delete(key);
+    EXPECT_EQ(wrong, std::vector<int32_t>(fakes.size(), 0));
+    std::set<void*> cached;
+    for (const rt::HostFunctionSlot& slot : answer.descriptor().slots) {
+        cached.insert(slot.module.load());
+    }
+    EXPECT_EQ(cached.size(), fakes.size()) << "one entry per module";
 }
 
 TEST_F(HostFunctionTest, EngineLibrariesAreFoundByTheirNamesWhenNothingIsNamed) {

@@ -1,31 +1,14 @@
-// Host error exceptions: their texts with and without a host text, their codes, where they are
-// raised, and the statuses they become at the exports.
+// Host error exceptions: their texts with and without a host text, and their codes.
 #include "kern/wb/WBErrorException.h"
 
-#include "kern/wb/HostErrorToHResult.h"
-#include "kern/wb/ThrowIfWBError.h"
 #include "runtime/HandleTable.h"
 
 #include <gtest/gtest.h>
 #include <string>
 
-using qv::kern::wb::CheckArrayIndex;
-using qv::kern::wb::CheckNewArraySize;
-using qv::kern::wb::HostErrorToHResult;
-using qv::kern::wb::ThrowIfNoHandle;
-using qv::kern::wb::ThrowIfWBError;
 using qv::kern::wb::WBErrorException;
 
 namespace {
-
-std::string MessageOf(void (*raise)()) {
-    try {
-        raise();
-    } catch (const WBErrorException& error) {
-        return error.what();
-    }
-    return "(nothing raised)";
-}
 
 TEST(WBErrorException, PrefixHoldsTheCodeInDecimalAndHexWithTheHostsTextOrTheFallback) {
     const auto& handles = wbhost::runtime::HandleTable::Instance();
@@ -50,50 +33,6 @@ TEST(WBErrorException, TextFormCarriesCodeOne) {
     EXPECT_EQ(text.GetErrorCode(), 1u);
     EXPECT_STREQ(WBErrorException(static_cast<const char*>(nullptr)).what(),
                  "Error Code: 1 (00000001): ");
-}
-
-TEST(ThrowIfWBError, RaisesNonZeroCodesWithItsOwnLocationAndCopiesKeepIt) {
-    EXPECT_NO_THROW(ThrowIfWBError(0));
-    try {
-        ThrowIfWBError(53);
-        FAIL() << "53 must raise";
-    } catch (const qv::kern::exception::Exception& error) {
-        const auto* hostError = dynamic_cast<const WBErrorException*>(&error);
-        ASSERT_NE(hostError, nullptr);
-        EXPECT_EQ(hostError->code(), 53);
-        EXPECT_NE(std::string(error.file()).find("ThrowIfWBError.cpp"), std::string::npos);
-        EXPECT_GT(error.line(), 0u);
-        const WBErrorException copy = *hostError;
-        EXPECT_EQ(copy.file(), error.file());
-        EXPECT_EQ(copy.line(), error.line());
-        EXPECT_STREQ(copy.what(), error.what());
-    }
-}
-
-TEST(HostArrayChecks, BoundsAndSizes) {
-    EXPECT_NO_THROW(CheckArrayIndex(2, 3));
-    EXPECT_EQ(MessageOf([] { CheckArrayIndex(3, 3); }),
-              "Error Code: 1 (00000001): Array index out of bounds.");
-    EXPECT_EQ(MessageOf([] { CheckArrayIndex(-1, 3); }),
-              "Error Code: 1 (00000001): Array index out of bounds.");
-    EXPECT_EQ(MessageOf([] { CheckArrayIndex(0, 0); }),
-              "Error Code: 1 (00000001): Array index out of bounds.");
-    EXPECT_NO_THROW(CheckNewArraySize(0));
-    EXPECT_EQ(MessageOf([] { CheckNewArraySize(-1); }),
-              "Error Code: 1 (00000001): Invalid new_size for array.");
-    EXPECT_EQ(MessageOf([] { ThrowIfNoHandle(nullptr); }),
-              "Error Code: 2 (00000002): The host ran out of memory.");
-}
-
-TEST(HostErrorToHResult, TableAndEverythingElseAsGeneralFailure) {
-    EXPECT_EQ(HostErrorToHResult(0), 0);
-    EXPECT_EQ(static_cast<uint32_t>(HostErrorToHResult(1)), 0x80070057u);
-    EXPECT_EQ(static_cast<uint32_t>(HostErrorToHResult(2)), 0x8007000Eu);
-    EXPECT_EQ(static_cast<uint32_t>(HostErrorToHResult(7)), 0x80030002u);
-    EXPECT_EQ(static_cast<uint32_t>(HostErrorToHResult(53)), 0x80004001u);
-    for (const int32_t other : {-1, 3, 42, 54, 0x7FFFFFFF}) {
-        EXPECT_EQ(static_cast<uint32_t>(HostErrorToHResult(other)), 0x80004005u) << other;
-    }
 }
 
 } // namespace
