@@ -47,6 +47,9 @@ void TIOAttrBagParser::StartTopSet(const wbhw::XmlAttributes& attributes) {
     }
     auto set = std::make_unique<TIOAttrBag>(name);
     current_->RemoveChild(name);
+    // The target itself counts as the first level, so what is read here writes out (from the
+    // target) no deeper than the reader accepts.
+    ++depth_;
     Enter(*current_->AdoptChild(set).first);
 }
 

@@ -103,6 +103,16 @@ TEST(AttrBagXml, NestingIsBounded) {
     EXPECT_EQ(TIOAttrBag::ReadXml(nested(TIOAttrBagParser::kMaxNesting), deepest), 0);
     TIOAttrBag tooDeep;
     EXPECT_EQ(TIOAttrBag::ReadXml(nested(100000), tooDeep), kFail);
+    // Under a top-level set with a parent the target is one level more: what was read must
+    // still read back once written out from the target.
+    TIOAttrBag target;
+    const std::u16string doc = nested(TIOAttrBagParser::kMaxNesting);
+    EXPECT_EQ(TIOAttrBag::ReadXml(u"<AttributeSet name='p' parent='/'>" + doc.substr(23), target),
+              kFail);
+    std::u16string written;
+    target.WriteXml(written);
+    TIOAttrBag again;
+    EXPECT_EQ(TIOAttrBag::ReadXml(written, again), 0);
 }
 
 TEST(AttrBagXml, OneUnencodableCharacterDoesNotLoseTheBag) {
