@@ -1,0 +1,40 @@
+// TIO_CompareTwoResourceTrees, called through the loaded module with host-style C texts.
+#include "LoadedModule.h"
+
+#include <cstdint>
+#include <gtest/gtest.h>
+#include <string>
+
+namespace {
+
+using CompareFn = uint32_t(const char*, const char*);
+
+TEST(CompareExport, AnswersTheThreeCodesAndTakesNullAsEmpty) {
+    test::LoadedModule module;
+    ASSERT_TRUE(module.Loaded()) << test::LoadedModule::LoadError();
+    auto* compare = module.Find<CompareFn>("TIO_CompareTwoResourceTrees");
+    ASSERT_NE(compare, nullptr);
+
+    const std::string required = "<IOResource><Direction>Input</Direction></IOResource>";
+    const std::string offered =
+        "<IOResource><Direction>INPUT</Direction><Pull>up</Pull></IOResource>";
+    EXPECT_EQ(compare(nullptr, nullptr), 0u);
+    EXPECT_EQ(compare(nullptr, offered.c_str()), 2u);
+    EXPECT_EQ(compare(required.c_str(), ""), 1u);
+    EXPECT_EQ(compare(required.c_str(), required.c_str()), 0u);
+    EXPECT_EQ(compare(required.c_str(), offered.c_str()), 2u);
+    EXPECT_EQ(compare(offered.c_str(), required.c_str()), 1u);
+}
+
+TEST(CompareExport, MultibyteTextsAreReadInTheDefaultCodePage) {
+    test::LoadedModule module;
+    ASSERT_TRUE(module.Loaded()) << test::LoadedModule::LoadError();
+    auto* compare = module.Find<CompareFn>("TIO_CompareTwoResourceTrees");
+    ASSERT_NE(compare, nullptr);
+    // "\xE9" is e-acute in the default single-byte code page; as UTF-8 bytes it would be invalid.
+    const std::string lower = "<IOResource><Name>caf\xE9</Name></IOResource>";
+    const std::string upper = "<IOResource><Name>CAF\xC9</Name></IOResource>";
+    EXPECT_EQ(compare(lower.c_str(), upper.c_str()), 0u);
+}
+
+} // namespace
