@@ -12,6 +12,7 @@
 
 #include <algorithm>
 #include <climits>
+#include <cstring>
 #include <initializer_list>
 #include <unicode/ucol.h>
 #include <unicode/uset.h>
@@ -58,13 +59,44 @@ bool AllCandidates(const UChar* text, int32_t length, const std::array<bool, 128
     return true;
 }
 
-// Drops the candidates that take part in a contraction (or a prefix rule) made of candidates
-// only: such a text is no longer one element per character.
-void DropContractions(const UCollator* c, std::array<bool, 128>& candidate) {
+// Calls f(text, length) for every string of the set; false when ICU fails.
+template <class F> bool ForEachString(const USet* set, F f) {
+    const int32_t items = uset_getItemCount(set);
+    for (int32_t i = 0; i < items; ++i) {
+        UChar32 start = 0;
+        UChar32 end = 0;
+        UChar text[64];
+        UErrorCode status = U_ZERO_ERROR;
+        const int32_t length = uset_getItem(set, i, &start, &end, text, 64, &status);
+        if (U_FAILURE(status))
+            return false;
+        if (length > 0)
+            f(text, length);
+    }
+    return true;
+}
+
+// Sorts out the candidates that expansions, contractions and prefix rules involve. An
+// expansion, or a contraction made of candidates only, drops them: such a text is no longer one
+// element per character. A contraction that goes on with other characters marks its leading
+// candidates in `starts`: a difference found at one of them is only final once the rest of both
+// texts is known to hold no such continuation.
+void SortOutContractions(const UCollator* c, std::array<bool, 128>& candidate,
+                         std::array<bool, 128>& starts) {
     UErrorCode status = U_ZERO_ERROR;
     SetPtr contractions(uset_openEmpty());
     SetPtr expansions(uset_openEmpty());
     ucol_getContractionsAndExpansions(c, contractions.get(), expansions.get(), true, &status);
+    const auto drop = [&](const UChar* text, int32_t length) {
+        if (AllCandidates(text, length, candidate)) {
+            for (int32_t k = 0; k < length; ++k)
+                candidate[text[k]] = false;
+        }
+    };
+    const auto mark = [&](const UChar* text, int32_t length) {
+        for (int32_t k = 0; k < length && text[k] < 128 && candidate[text[k]]; ++k)
+            starts[text[k]] = true;
+    };
     if (U_FAILURE(status)) {
         candidate.fill(false);
         return;
@@ -73,22 +105,8 @@ void DropContractions(const UCollator* c, std::array<bool, 128>& candidate) {
         if (uset_contains(expansions.get(), u))
             candidate[u] = false;
     }
-    const int32_t items = uset_getItemCount(contractions.get());
-    for (int32_t i = 0; i < items; ++i) {
-        UChar32 start = 0;
-        UChar32 end = 0;
-        UChar text[64];
-        status = U_ZERO_ERROR;
-        const int32_t length = uset_getItem(contractions.get(), i, &start, &end, text, 64, &status);
-        if (U_FAILURE(status)) {
-            candidate.fill(false);
-            return;
-        }
-        if (length > 0 && AllCandidates(text, length, candidate)) {
-            for (int32_t k = 0; k < length; ++k)
-                candidate[text[k]] = false;
-        }
-    }
+    if (!ForEachString(contractions.get(), drop) || !ForEachString(contractions.get(), mark))
+        candidate.fill(false);
 }
 
 } // namespace
@@ -122,7 +140,7 @@ void NameCollator::BuildAsciiRanks(const char* locale) {
         // strength, so a text is no longer one element per character.
         candidate[u] = ucol_strcoll(primary.get(), &u, 1, &none, 0) != UCOL_EQUAL;
     }
-    DropContractions(collator_.get(), candidate);
+    SortOutContractions(collator_.get(), candidate, contractionStarts_);
 
     std::vector<char16_t> order;
     for (char16_t u = 0; u < 128; ++u) {
@@ -153,25 +171,36 @@ void NameCollator::BuildAsciiRanks(const char* locale) {
     fastPath_ = true;
 }
 
-int NameCollator::CompareRanks(std::u16string_view a, std::u16string_view b) const noexcept {
-    int answer = 0;
-    const size_t common = std::min(a.size(), b.size());
-    for (size_t i = 0; i < common; ++i) {
-        const char16_t x = a[i];
-        const char16_t y = b[i];
-        if (x >= 128 || y >= 128 || ranks_[x] == 0 || ranks_[y] == 0)
-            return 2;
-        if (answer == 0 && ranks_[x] != ranks_[y])
-            answer = ranks_[x] < ranks_[y] ? -1 : 1;
-    }
-    // The tails must be rankable too: only then is the first difference the answer.
-    const std::u16string_view tail = a.size() > common ? a.substr(common) : b.substr(common);
-    for (const char16_t u : tail) {
+bool NameCollator::AllRanked(std::u16string_view text) const noexcept {
+    for (const char16_t u : text) {
         if (u >= 128 || ranks_[u] == 0)
-            return 2;
+            return false;
     }
-    if (answer != 0 || a.size() == b.size())
-        return answer;
+    return true;
+}
+
+int NameCollator::CompareRanks(std::u16string_view a, std::u16string_view b) const noexcept {
+    const size_t common = std::min(a.size(), b.size());
+    size_t i = 0;
+    for (; i < common; ++i) {
+        const uint8_t x = a[i] < 128 ? ranks_[a[i]] : 0;
+        const uint8_t y = b[i] < 128 ? ranks_[b[i]] : 0;
+        if (x == 0 || y == 0)
+            return 2;
+        if (x == y)
+            continue;
+        // Characters before this one cannot reach past it in a contraction (they would have to
+        // start one that continues with ranked characters only); this one might.
+        if ((contractionStarts_[a[i]] || contractionStarts_[b[i]]) &&
+            !(AllRanked(a.substr(i)) && AllRanked(b.substr(i))))
+            return 2;
+        return x < y ? -1 : 1;
+    }
+    // Equal so far: the longer text is greater only if its rest is not ignorable.
+    if (!AllRanked(a.substr(common)) || !AllRanked(b.substr(common)))
+        return 2;
+    if (a.size() == b.size())
+        return 0;
     return a.size() < b.size() ? -1 : 1;
 }
 
@@ -185,14 +214,15 @@ int NameCollator::CompareWithCollator(std::u16string_view a, std::u16string_view
 int NameCollator::Compare(std::u16string_view a, std::u16string_view b) const noexcept {
     if (collator_ == nullptr)
         return 0;
+    // Texts identical unit for unit are equal in every collation; a lookup by the stored
+    // spelling is the common case, and a block compare settles it fastest.
+    if (a.size() == b.size() && std::memcmp(a.data(), b.data(), a.size() * sizeof(char16_t)) == 0)
+        return 0;
     if (fastPath_) {
         const int answer = CompareRanks(a, b);
         if (answer != 2)
             return answer;
     }
-    // Texts identical unit for unit are equal in every collation.
-    if (a == b)
-        return 0;
     return CompareWithCollator(a, b);
 }
 

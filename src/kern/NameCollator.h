@@ -39,12 +39,16 @@ private:
     using CollatorPtr = std::unique_ptr<UCollator, Closer>;
 
     void BuildAsciiRanks(const char* locale);
+    // True when every unit of the text has a rank.
+    bool AllRanked(std::u16string_view text) const noexcept;
     // Answers the fast path's result, or 2 when a text holds something the table cannot rank.
     int CompareRanks(std::u16string_view a, std::u16string_view b) const noexcept;
 
     CollatorPtr collator_;
     // The collation rank of each ASCII code unit; 0 marks one that only ICU may order.
     std::array<uint8_t, 128> ranks_{};
+    // ASCII code units that begin a contraction continuing with characters outside the table.
+    std::array<bool, 128> contractionStarts_{};
     bool fastPath_ = false;
 };
 

@@ -14,9 +14,10 @@ namespace {
 // Letters, digits and punctuation of ASCII, plus a few that only ICU may order: controls (which
 // ICU ignores), accented letters, a combining mark, and letters that form contractions in some
 // tailorings.
-const std::u16string kPool = u" !\"#$%&'()*+,-./0123456789:;<=>?@ABCDEFGHIJKLMNOPQRSTUVWXYZ"
-                             u"[\\]^_`abcdefghijklmnopqrstuvwxyz{|}~\t\x01\x7F"
-                             u"\u00E9\u00C5\u00E5\u0131\u0130\u0301chCHaAiI";
+const std::u16string kPool =
+    u" !\"#$%&'()*+,-./0123456789:;<=>?@ABCDEFGHIJKLMNOPQRSTUVWXYZ"
+    u"[\\]^_`abcdefghijklmnopqrstuvwxyz{|}~\t\x01\x7F"
+    u"\u00E9\u00C5\u00E5\u0131\u0130\u0301\u0307\u030A\u00B7\u0327chCHlLaAiI";
 
 class NameGenerator {
 public:
@@ -102,6 +103,8 @@ TEST(NameCollator, OrdersAsTheCollatorDoesNotAsAsciiDoes) {
 TEST(NameCollator, TailoredLettersKeepTheirLocalMeaning) {
     // In Turkish dotless and dotted i are different letters, so I and i differ.
     EXPECT_NE(NameCollator("tr").Compare(u"DIO", u"dio"), 0);
+    // ...and I followed by a combining dot is the capital of i, decided only with the dot.
+    EXPECT_EQ(NameCollator("tr").Compare(u"DI\u0307O", u"dio"), 0);
     // In Czech "ch" sorts after "h".
     EXPECT_EQ(NameCollator("cs").Compare(u"chata", u"hrad"), 1);
     EXPECT_EQ(NameCollator("").Compare(u"chata", u"hrad"), -1);
