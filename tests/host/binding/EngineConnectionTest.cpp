@@ -102,6 +102,23 @@ TEST(EngineConnection, InstalledEngineIsFoundUnderTheShortenedVersion) {
     fs::remove_all(root);
 }
 
+TEST(RuntimeLoader, ExplicitDirectoryIsUsedAsGivenAndKindTwoNeedsAnExistingExecutable) {
+    const rt::EngineSearchEnvironment env;
+    const std::string directory = fs::path(hostrt_test::FakeWbrtPath()).parent_path().string();
+    const DynamicModule loaded = rt::LoadRuntime(rt::kRunTimeEngine, "99.0", directory, env);
+    ASSERT_TRUE(loaded);
+    EXPECT_EQ(rt::RuntimeVersionOf(loaded.handle()), "16.0");
+    EXPECT_FALSE(rt::LoadRuntime(rt::kFFRunTimeEngine, "", directory, env))
+        << "that directory has no libwbffrt.so";
+
+    rt::EngineSearchEnvironment noExecutable;
+    noExecutable.executablePath = "/nonexistent/host";
+    EXPECT_FALSE(rt::LoadRuntime(rt::kProcessRuntime, "", "", noExecutable));
+    const auto self = rt::EngineSearchEnvironment::FromProcess();
+    EXPECT_EQ(rt::LoadRuntime(rt::kProcessRuntime, "", "", self).handle(),
+              qv::kern::osdep::MainModule());
+}
+
 class ConnectionListTest : public ::testing::Test {
 protected:
     void SetUp() override { ASSERT_TRUE(observer_); }

@@ -113,6 +113,16 @@ TEST_F(EngineSearchTest, WithoutAVersionOnlyTheProfileAndExecutableFolderAreSear
     EXPECT_FALSE(Find("").found);
 }
 
+TEST_F(EngineSearchTest, DirectoryWalkFromTheExecutableUpwardsComesFirst) {
+    PlaceLibrary("bin");
+    fs::create_directories(root_ / "bin/engines"); // a walk folder without the library
+    const std::string walked = PlaceLibrary("engines");
+    auto record = rt::EngineSearchRecord::ForKind(0, "16.0");
+    record.directoryWalkName = "engines";
+    const auto result = rt::FindRunTimeEngine(rt::kRunTimeEngineLibrary, record, env_);
+    EXPECT_EQ(result.path, walked);
+}
+
 TEST(EngineSearchEnvironment, ProfileFileAndExpansion) {
     rt::EngineSearchEnvironment env;
     env.executablePath = "/opt/app/host.exe";
