@@ -1,7 +1,7 @@
 // Registration of the module's item types.
 #include "provider/TIOItemRegistry.h"
 
-#include "framework/CqxProjectItemUI.h"
+#include "framework/CqxItemUI.h"
 #include "items/TIOInstanceItemUI.h"
 #include "provider/TIOIdentifiers.h"
 #include "provider/TIOInstanceCreateNewWizard.h"
@@ -14,7 +14,7 @@ namespace tio {
 namespace {
 
 // The framework's generic item as this provider creates it.
-using GenericItemInfo = CqxpItemUIInfoT<CqxProjectItemUI, TIOProvider>;
+using GenericItemInfo = CqxpItemUIInfoT<CqxItemUI, TIOProvider>;
 using IOItemInfo = CqxpItemUIInfoT<TIOInstanceItemUI, TIOProvider>;
 using WizardInfo = CqxpBindableItemInfoT<TIOInstanceCreateNewWizard, TIOProvider>;
 
