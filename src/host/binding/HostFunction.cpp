@@ -8,6 +8,7 @@
 #include "kern/osdep/DynamicModule.h"
 
 #include <cstdio>
+#include <thread>
 
 namespace qv::host::rt {
 
@@ -16,8 +17,51 @@ namespace {
 constexpr const char kNoRuntimeMessage[] =
     "wirebenchv.lib was not called from a Wirebench process.";
 
+// Rewrites of one entry are serialised, and readers retry while one is under way: two modules
+// with one stamp share an entry and rebind it in turn, and a thread must never call one module's
+// address believing it belongs to the other.
+class SlotRewrite {
+public:
+    explicit SlotRewrite(HostFunctionSlot& slot) : slot_(slot) {
+        for (;;) {
+            uint32_t current = slot_.sequence.load();
+            if ((current & 1) == 0 && slot_.sequence.compare_exchange_weak(current, current + 1)) {
+                return;
+            }
+            std::this_thread::yield();
+        }
+    }
+    ~SlotRewrite() { slot_.sequence.fetch_add(1); }
+    SlotRewrite(const SlotRewrite&) = delete;
+    SlotRewrite& operator=(const SlotRewrite&) = delete;
+
+private:
+    HostFunctionSlot& slot_;
+};
+
+struct SlotBinding {
+    void* module;
+    void* address;
+};
+
+// The module and address of an entry as one consistent pair.
+SlotBinding ReadSlot(const HostFunctionSlot& slot) noexcept {
+    for (;;) {
+        const uint32_t before = slot.sequence.load();
+        if ((before & 1) == 0) {
+            const SlotBinding binding{slot.module.load(), slot.address.load()};
+            if (slot.sequence.load() == before) {
+                return binding;
+            }
+        }
+        std::this_thread::yield();
+    }
+}
+
 void* Bind(HostFunctionSlot& slot, const char* name, void* module, uint64_t stamp) noexcept {
+    // The lookup runs before the entry is taken: it may be slow, and readers wait meanwhile.
     void* const address = kern::osdep::ModuleExport(module, name);
+    const SlotRewrite rewrite(slot);
     slot.address.store(address);
     slot.module.store(module);
     slot.stamp.store(stamp);
@@ -30,8 +74,9 @@ void* WalkCache(HostFunction& function, void* module, uint64_t stamp) noexcept {
     for (HostFunctionSlot& slot : function.slots) {
         const uint64_t slotStamp = slot.stamp.load();
         if (slotStamp == stamp) {
-            if (slot.module.load() == module) {
-                return slot.address.load();
+            const SlotBinding binding = ReadSlot(slot);
+            if (binding.module == module) {
+                return binding.address;
             }
             return Bind(slot, function.name, module, stamp);
         }
@@ -49,16 +94,25 @@ void* WalkCache(HostFunction& function, void* module, uint64_t stamp) noexcept {
 // Takes over the entry of a module that has been unloaded since it was cached.
 void* ReclaimUnloaded(HostFunction& function, void* module, uint64_t stamp) noexcept {
     for (HostFunctionSlot& slot : function.slots) {
-        void* old = slot.module.load();
+        const SlotBinding binding = ReadSlot(slot);
+        void* const old = binding.module;
         if (old == module && slot.stamp.load() == stamp) {
-            return slot.address.load();
+            return binding.address;
         }
         if (old == nullptr || kern::osdep::IsModuleLoaded(old)) {
             continue;
         }
-        if (slot.module.compare_exchange_strong(old, module)) {
-            return Bind(slot, function.name, module, stamp);
+        // Claimed only if the entry still holds the unloaded module once we own it; taking it
+        // under the rewrite guard keeps readers from pairing our module with the old address.
+        void* const address = kern::osdep::ModuleExport(module, function.name);
+        const SlotRewrite rewrite(slot);
+        if (slot.module.load() != old) {
+            continue;
         }
+        slot.address.store(address);
+        slot.module.store(module);
+        slot.stamp.store(stamp);
+        return address;
     }
     return nullptr;
 }

@@ -8,11 +8,13 @@
 namespace qv::host::rt {
 
 // One cache entry: a runtime module, its stamp and the function's address in it. A stamp of 0
-// marks a free entry.
+// marks a free entry. `sequence` is odd while the entry is being rewritten, so that a reader never
+// pairs one module with another module's address.
 struct HostFunctionSlot {
     std::atomic<void*> module{nullptr};
     std::atomic<uint64_t> stamp{0};
     std::atomic<void*> address{nullptr};
+    std::atomic<uint32_t> sequence{0};
 };
 
 // The descriptor of one bound host function: eight cache entries (one per runtime module seen)

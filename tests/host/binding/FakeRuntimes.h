@@ -8,7 +8,8 @@
 
 namespace hostrt_test {
 
-// Path of fake runtime number `n` (1 to 9); its FakeAnswer() answers n.
+// Path of fake runtime number `n` (1 to 9, or 11 and 12, which share one build id); its
+// FakeAnswer() answers n.
 std::string FakePath(int n);
 // Path of the fake whose soname is "libwbrt.so" (answer 100, revision 40, version "16.0").
 std::string FakeWbrtPath();

@@ -126,6 +126,37 @@ TEST_F(HostFunctionTest, ThreadsOfDifferentModulesClaimDifferentEntries) {
     EXPECT_EQ(cached.size(), fakes.size()) << "one entry per module";
 }
 
+TEST_F(HostFunctionTest, ModulesWithOneStampShareAnEntryYetEachAnswersForItself) {
+    static rt::BoundFunction<AnswerFn> answer{"FakeAnswer"};
+    ClearCache(answer);
+    const auto twins = LoadFakes(11, 12);
+    ASSERT_EQ(ModuleStamp(twins[0].handle()), ModuleStamp(twins[1].handle()));
+    EXPECT_EQ(AnswerIn(answer, twins[0].handle()), 11);
+    EXPECT_EQ(AnswerIn(answer, twins[1].handle()), 12);
+    EXPECT_EQ(AnswerIn(answer, twins[0].handle()), 11);
+    EXPECT_EQ(answer.descriptor().slots[1].stamp.load(), 0u) << "the second twin rebinds entry 0";
+
+    // Two threads switching the shared entry back and forth must never get the other's answer.
+    pthread_key_t key;
+    ASSERT_EQ(pthread_key_create(&key, nullptr), 0);
+    rt::SetRuntimeTlsIndex(static_cast<uint32_t>(key));
+    int32_t wrong[2] = {0, 0};
+    std::vector<std::thread> threads;
+    for (int t = 0; t < 2; ++t) {
+        threads.emplace_back([&, t] {
+            pthread_setspecific(key, twins[t].handle());
+            for (int i = 0; i < 5000; ++i) {
+                wrong[t] += answer() != 11 + t;
+            }
+        });
+    }
+    for (std::thread& thread : threads) {
+        thread.join();
+    }
+    pthread_key_delete(key);
+    EXPECT_EQ(wrong[0] + wrong[1], 0);
+}
+
 TEST_F(HostFunctionTest, EngineLibrariesAreFoundByTheirNamesWhenNothingIsNamed) {
     static rt::BoundFunction<AnswerFn> answer{"FakeAnswer"};
     EXPECT_EQ(rt::CurrentRuntimeModule(), nullptr);
