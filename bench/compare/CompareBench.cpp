@@ -1,7 +1,6 @@
-// The comparison of resource descriptions: a cached answer against the uncached comparison of the
-// same pair (CPU time; the ratio is printed at the end), with the cache full of long texts that
-// share long prefixes (as descriptions of one target do). Prints the ratio cached/uncached measured
-// in the same run.
+// The comparison of resource descriptions: a cached answer against the uncached comparison of
+// the same pair, with the cache full of long texts that share long prefixes (as descriptions of
+// one target do). Prints the ratio of their CPU times, measured in the same run.
 #include "resource_tree/CompareCache.h"
 #include "resource_tree/ResourceCompare.h"
 
