@@ -207,8 +207,12 @@ int NameCollator::CompareRanks(std::u16string_view a, std::u16string_view b) con
 int NameCollator::CompareWithCollator(std::u16string_view a, std::u16string_view b) const noexcept {
     if (collator_ == nullptr)
         return 0;
-    return ToTriState(ucol_strcoll(collator_.get(), a.data(), IcuLength(a.size()), b.data(),
-                                   IcuLength(b.size())));
+    // ICU treats a null text as an error, not as empty.
+    static constexpr UChar kEmpty[1] = {0};
+    const UChar* const x = a.data() != nullptr ? a.data() : kEmpty;
+    const UChar* const y = b.data() != nullptr ? b.data() : kEmpty;
+    return ToTriState(
+        ucol_strcoll(collator_.get(), x, IcuLength(a.size()), y, IcuLength(b.size())));
 }
 
 int NameCollator::Compare(std::u16string_view a, std::u16string_view b) const noexcept {
@@ -216,7 +220,9 @@ int NameCollator::Compare(std::u16string_view a, std::u16string_view b) const no
         return 0;
     // Texts identical unit for unit are equal in every collation; a lookup by the stored
     // spelling is the common case, and a block compare settles it fastest.
-    if (a.size() == b.size() && std::memcmp(a.data(), b.data(), a.size() * sizeof(char16_t)) == 0)
+    // (A null text is empty and must not reach memcmp.)
+    if (a.size() == b.size() &&
+        (a.empty() || std::memcmp(a.data(), b.data(), a.size() * sizeof(char16_t)) == 0))
         return 0;
     if (fastPath_) {
         const int answer = CompareRanks(a, b);

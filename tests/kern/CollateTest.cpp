@@ -37,6 +37,7 @@ TEST(Collate, NamesKeyAMapIgnoringCase) {
     EXPECT_EQ(names.find(u"mod1/Ai0")->second, 2);
     EXPECT_EQ(CompareNoCase({}, u""), 0);
     EXPECT_EQ(CompareNoCase({}, u"a"), -1);
+    EXPECT_EQ(qv::kern::NameCollator("en@colNumeric=yes").Compare({}, u"\u00E9"), -1);
 }
 
 TEST(Collate, ThreadsAgreeWithEachOther) {
