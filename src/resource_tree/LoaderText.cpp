@@ -222,6 +222,10 @@ std::u16string LocalizeText(std::u16string_view value, std::u16string_view langu
 }
 
 std::u16string PlatformPathText(std::u16string_view text) {
+    // Most paths are already in the platform's form: no escapes, no empty pieces.
+    if (text.find(u'\\') == std::u16string_view::npos &&
+        text.find(u"//") == std::u16string_view::npos && (text.empty() || text.back() != u'/'))
+        return std::u16string(text);
     std::u16string out;
     // A leading separator keeps the path absolute; other empty pieces join to nothing.
     if (!text.empty() && text.front() == u'/')
@@ -245,9 +249,17 @@ std::string JoinFilePath(const std::string& base, const std::string& relative) {
 }
 
 std::string ToUtf8(std::u16string_view text) {
-    std::string out;
-    out.reserve(text.size() + text.size() / 4);
-    for (size_t i = 0; i < text.size(); ++i) {
+    // Markup is nearly all ASCII: that part is narrowed in one pass into a buffer of its size.
+    size_t ascii = 0;
+    while (ascii < text.size() && text[ascii] < 0x80)
+        ++ascii;
+    std::string out(ascii, '\0');
+    for (size_t i = 0; i < ascii; ++i)
+        out[i] = static_cast<char>(text[i]);
+    if (ascii == text.size())
+        return out;
+    out.reserve(text.size() + (text.size() - ascii) / 2);
+    for (size_t i = ascii; i < text.size(); ++i) {
         const char16_t c = text[i];
         if (c < 0x80) {
             out.push_back(static_cast<char>(c));

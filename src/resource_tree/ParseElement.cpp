@@ -112,7 +112,8 @@ ParseStack::Frame* ParseStack::ProcessNode(Frame& frame, bool container, const s
     // "replace" rules this element and what is made inside it, not its later siblings.
     const bool overwrite =
         steering.replace != nullptr ? !IsTrueWord(*steering.replace) : frame.overwrite;
-    const std::u16string tagName = frame.pendingName;
+    // The tag stays in the frame until this element is done.
+    const std::u16string& tagName = frame.pendingName;
     frame.hasPending = false;
 
     if (frame.documentType.empty()) {
@@ -164,11 +165,13 @@ ParseStack::Frame* ParseStack::ProcessNode(Frame& frame, bool container, const s
 void ParseStack::ProcessText(Frame& frame, const std::u16string& name, const Steering& steering,
                              const TagInfo& tag) {
     ResTreeNode& node = *frame.node;
-    std::u16string text = std::move(frame.text);
-    frame.text.clear();
     frame.hasPending = false;
+    std::u16string_view gathered = frame.text;
     if (!Equals(steering.xmlSpace, u"preserve"))
-        text = std::u16string(TrimBlanks(text));
+        gathered = TrimBlanks(gathered);
+    std::u16string text(gathered);
+    // The frame keeps its buffer for the next element.
+    frame.text.clear();
     const bool isPath = steering.type != nullptr ? Equals(steering.type, u"path") : tag.isPathText;
     const bool isReferenceList =
         steering.type != nullptr ? Equals(steering.type, u"ref-list") : tag.isReserves;
@@ -192,19 +195,20 @@ void ParseStack::ProcessText(Frame& frame, const std::u16string& name, const Ste
         kind = EntryKind::LocalizedText;
     }
     CountEntry(node);
-    const auto added = node.AddText(InsertPosition(node, steering), name, text, kind);
-    if (!added.inserted && frame.overwrite && node.SetTextAt(added.position, std::move(text)) &&
-        kind == EntryKind::LocalizedText)
-        node.SetTextKindAt(added.position, kind);
+    node.AddOrSetText(InsertPosition(node, steering), WString(name), WString(std::move(text)), kind,
+                      frame.overwrite);
 }
 
 std::u16string ParseStack::RewriteReferenceList(ResTreeNode& node,
                                                 const std::u16string& text) const {
     std::vector<std::u16string> pieces = SplitListText(text, u',', true);
-    const WString base = node.Path();
+    WString base;
     for (std::u16string& piece : pieces) {
-        if (!piece.empty() && piece.front() == u'/')
-            piece = RelativeResourcePath(base, piece);
+        if (piece.empty() || piece.front() != u'/')
+            continue;
+        if (base.empty())
+            base = node.Path();
+        piece = RelativeResourcePath(base, piece);
     }
     return JoinListText(pieces, u',');
 }

@@ -14,6 +14,9 @@ constexpr std::u16string_view kDisplayName = u"DisplayName";
 constexpr int kMaxLinkHops = 64;
 thread_local int linkHops = 0;
 
+// Ordered nodes up to this size are scanned; larger ones keep a name index.
+constexpr size_t kIndexFrom = 24;
+
 } // namespace
 
 ResTreeEntry::ResTreeEntry(WString name, EntryKind kind) : name_(std::move(name)), kind_(kind) {}
@@ -49,6 +52,7 @@ ResTreeNode::ResTreeNode(WString name, WString type, bool ordered, ResTreeNode* 
     : name_(std::move(name)), type_(std::move(type)), ordered_(ordered), parent_(parent) {}
 
 ResTreeNode::~ResTreeNode() {
+    index_.reset();
     StopWatchingAll();
     parent_ = nullptr;
     // Children unregister from this node while it is still whole.
@@ -74,6 +78,15 @@ ResTreeNode::Position ResTreeNode::End() const noexcept {
 ResTreeNode::Position ResTreeNode::Find(std::u16string_view name) const noexcept {
     if (!ordered_)
         return Position(set_.find(name));
+    if (list_.size() > kIndexFrom) {
+        if (!index_) {
+            index_ = std::make_unique<NameIndex>();
+            for (auto it = list_.begin(); it != list_.end(); ++it)
+                index_->emplace(std::u16string_view(it->name_), it);
+        }
+        const auto found = index_->find(name);
+        return found == index_->end() ? End() : Position(found->second);
+    }
     for (auto it = list_.begin(); it != list_.end(); ++it) {
         if (qv::kern::EqualsNoCase(it->Name(), name))
             return Position(it);
@@ -119,7 +132,10 @@ ResTreeNode::Position ResTreeNode::InsertEntry(Position position, WString&& name
     if (ordered_) {
         inserted = true;
         const auto before = position.ordered_ ? position.list_ : list_.end();
-        return Position(list_.emplace(before, std::move(name), kind));
+        const auto made = list_.emplace(before, std::move(name), kind);
+        if (index_)
+            IndexInserted(made, before == list_.end());
+        return Position(made);
     }
     const auto hint = set_.lower_bound(std::u16string_view(name));
     if (hint != set_.end() && qv::kern::EqualsNoCase(hint->Name(), name)) {
@@ -166,6 +182,21 @@ ResTreeNode::AddChildResult ResTreeNode::AddChild(Position position, WString nam
     return {at, at->child_.get(), true};
 }
 
+ResTreeNode::AddResult ResTreeNode::AddOrSetText(Position position, WString name, WString text,
+                                                 EntryKind kind, bool overwrite) {
+    if (!IsTextKind(kind))
+        kind = EntryKind::Text;
+    bool inserted = false;
+    const Position at = InsertEntry(position, std::move(name), kind, inserted);
+    if (inserted) {
+        at->text_ = std::move(text);
+        RaiseChanges(kValueAdded);
+    } else if (overwrite && SetTextAt(at, std::move(text)) && kind == EntryKind::LocalizedText) {
+        at->kind_ = kind;
+    }
+    return {at, inserted};
+}
+
 bool ResTreeNode::SetTextAt(Position position, WString text) {
     if (position == End() || !IsTextKind(position->Kind()))
         return false;
@@ -208,7 +239,41 @@ bool ResTreeNode::SetTextKindAt(Position position, EntryKind kind) {
     return true;
 }
 
+void ResTreeNode::IndexInserted(std::list<ResTreeEntry>::iterator entry, bool atEnd) {
+    const auto [at, isNew] = index_->emplace(std::u16string_view(entry->name_), entry);
+    if (isNew || atEnd)
+        return;
+    // Inserted before some entry: it is the first of its name if the old first follows it.
+    for (auto it = std::next(entry); it != list_.end(); ++it) {
+        if (it == at->second) {
+            index_->erase(at);
+            index_->emplace(std::u16string_view(entry->name_), entry);
+            return;
+        }
+    }
+}
+
+void ResTreeNode::IndexErasing(std::list<ResTreeEntry>::iterator entry) {
+    const auto at = index_->find(std::u16string_view(entry->name_));
+    if (at == index_->end() || at->second != entry)
+        return;
+    index_->erase(at);
+    for (auto it = std::next(entry); it != list_.end(); ++it) {
+        if (qv::kern::EqualsNoCase(it->name_, entry->name_)) {
+            index_->emplace(std::u16string_view(it->name_), it);
+            return;
+        }
+    }
+}
+
 void ResTreeNode::EraseEntry(Position position) noexcept {
+    if (ordered_ && index_) {
+        try {
+            IndexErasing(position.list_);
+        } catch (...) {
+            index_.reset(); // rebuilt on the next lookup
+        }
+    }
     if (ordered_)
         list_.erase(position.list_);
     else
@@ -264,6 +329,7 @@ void ResTreeNode::RemoveAllChildren() {
 void ResTreeNode::SetOrdered(bool ordered) {
     if (ordered == ordered_)
         return;
+    index_.reset();
     if (ordered) {
         while (!set_.empty()) {
             auto handle = set_.extract(set_.begin());

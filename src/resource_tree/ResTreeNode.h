@@ -1,12 +1,14 @@
 // A node of a resource tree: a named, typed set of entries (texts, links, child nodes).
 #pragma once
 
+#include "kern/Collate.h"
 #include "kern/StringBase.h"
 #include "resource_tree/LoaderSettings.h"
 #include "resource_tree/ResTreeNodeChangeObserver.h"
 
 #include <cstdint>
 #include <list>
+#include <map>
 #include <memory>
 #include <set>
 #include <string>
@@ -152,6 +154,10 @@ public:
     // existing name is kept and its position answered). Raises ValueAdded when inserted.
     AddResult AddText(Position position, WString name, WString text,
                       EntryKind kind = EntryKind::Text);
+    // AddText, and when the name exists (unordered) and OVERWRITE, sets its text (and for a
+    // LocalizedText its kind) as SetTextAt does.
+    AddResult AddOrSetText(Position position, WString name, WString text, EntryKind kind,
+                           bool overwrite);
     // The same for a Link entry holding PATH. Raises ChildAdded when inserted.
     AddResult AddLink(Position position, WString name, WString path);
     // Inserts a new child node, or (unordered) answers the existing entry of that name as is.
@@ -248,6 +254,12 @@ private:
     bool IsWatching(const ResTreeNode& other) const noexcept;
     Position InsertEntry(Position position, WString&& name, EntryKind kind, bool& inserted);
     void EraseEntry(Position position) noexcept;
+    void IndexInserted(std::list<ResTreeEntry>::iterator entry, bool atEnd);
+    void IndexErasing(std::list<ResTreeEntry>::iterator entry);
+    // The first entry of each name in a large ordered node; without it every lookup, and so
+    // every element loaded into a long list, scans the list.
+    using NameIndex =
+        std::map<std::u16string_view, std::list<ResTreeEntry>::iterator, qv::kern::LessNoCase>;
 
     WString name_;
     WString type_;
@@ -260,6 +272,7 @@ private:
     mutable std::list<ResTreeEntry> list_;
     mutable std::set<ResTreeEntry, EntryNameLess> set_;
     std::unique_ptr<Observers> observers_;
+    mutable std::unique_ptr<NameIndex> index_;
 };
 
 // Keeps a node (and so its ancestors) from being removed while a load works on it.

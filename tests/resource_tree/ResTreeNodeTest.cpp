@@ -2,6 +2,7 @@
 #include "resource_tree/ResTreeNode.h"
 
 #include "TreeTestSupport.h"
+#include "kern/Collate.h"
 #include "resource_tree/TypeRegistry.h"
 
 #include <gtest/gtest.h>
@@ -40,6 +41,39 @@ TEST(ResTreeNode, OrderedNodesKeepDuplicatesInInsertionOrder) {
     node.AddText(second.position, u"before", u"");
     EXPECT_EQ(Names(node), (std::vector<std::u16string>{u"Pin", u"before", u"PIN"}));
     EXPECT_EQ(*node.Find(u"pin")->Text(), u"first");
+}
+
+TEST(ResTreeNode, LargeOrderedNodesFindTheFirstOfEachNameAsAScanWould) {
+    ResTreeNode node(u"n", u"ResourceList", true);
+    std::vector<std::u16string> spellings = {u"a", u"A", u"b", u"B", u"c"};
+    auto firstByScan = [&node](std::u16string_view name) {
+        for (ResTreePosition at = node.Begin(); at != node.End(); ++at) {
+            if (qv::kern::EqualsNoCase(at->Name(), name))
+                return at;
+        }
+        return node.End();
+    };
+    uint32_t state = 7;
+    auto next = [&state] { return state = state * 1103515245u + 12345u; };
+    for (int round = 0; round < 400; ++round) {
+        const std::u16string name = spellings[next() % spellings.size()] +
+                                    std::u16string(1, static_cast<char16_t>(u'0' + next() % 8));
+        const uint32_t action = next() % 4;
+        if (action == 0 && !node.IsEmpty()) {
+            // Insert before some existing entry.
+            ResTreePosition at = node.Begin();
+            for (uint32_t steps = next() % node.EntryCount(); steps > 0; --steps)
+                ++at;
+            node.AddText(at, name, u"");
+        } else if (action == 1) {
+            node.RemoveByName(name);
+        } else {
+            node.AddText(node.End(), name, u"");
+        }
+        for (const std::u16string& probe : {name, std::u16string(u"A3"), std::u16string(u"c7")})
+            ASSERT_TRUE(node.Find(probe) == firstByScan(probe)) << round;
+    }
+    EXPECT_GT(node.EntryCount(), 30u);
 }
 
 TEST(ResTreeNode, TextsAreSetOnlyOnTextEntries) {
