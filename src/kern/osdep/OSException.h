@@ -18,13 +18,17 @@ public:
     // An error with the given message and OS error code; an empty message reads "Unknown error".
     OSException(std::string message, uint32_t osError);
 
+    // The message ("Unknown error" when none is known).
     const char* what() const noexcept override { return message_.c_str(); }
+    // 42, the host's code for a generic failure.
     uint32_t GetErrorCode() const noexcept override { return 42u; }
     // The OS error code behind the exception, 0 when none was given.
     virtual uint32_t GetOSErrorCode() const noexcept { return osError_; }
 
 protected:
+    // Replaces the message; an empty one reads "Unknown error".
     void SetMessage(std::string message);
+    // Replaces the OS error code.
     void SetOSError(uint32_t osError) noexcept { osError_ = osError; }
 
 private:
