@@ -17,5 +17,6 @@ WBRT_EXPORT NumericArrayResizeFn NumericArrayResize;
 WBRT_EXPORT LToCStrNFn LToCStrN;
 WBRT_EXPORT GGetOneErrorCodeFn GGetOneErrorCode;
 WBRT_EXPORT GetLangStrFn GetLangStr;
+WBRT_EXPORT QueryInterfaceForWBRefNumFn QueryInterfaceForWBRefNum;
 // The size in bytes of a live block; 0 for null or unknown handles.
 WBRT_EXPORT size_t DSGetHandleSize(WBHandle handle);

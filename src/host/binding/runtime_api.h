@@ -78,9 +78,11 @@ typedef WBErr GetLangStrFn(int32_t selector, WBHandle* text);
 // Host objects. The project target item behind an application reference (a COM interface
 // pointer, added-to, in *item).
 typedef WBErr TargetItemFromAppRefFn(WBRefNum appRef, void** item);
-// The COM interface `iid` (a pointer to a 16-byte GUID) of the object behind a reference number;
+// The COM interface `iid` (a pointer to a 16-byte GUID) of the object behind the reference number
+// at `refnum` (host programs hand refnums by reference, and the pointer is passed on as it came);
 // answers a COM-style status.
-typedef int32_t QueryInterfaceForWBRefNumFn(WBRefNum refnum, const void* iid, void** object);
+typedef int32_t QueryInterfaceForWBRefNumFn(const WBRefNum* refnum, const void* iid,
+                                            void** object);
 
 // Variants. Attribute names are Pascal strings (a length byte, then the bytes).
 typedef WBErr WbVariantPStrGetStringAttrFn(WBVariant variant, const unsigned char* name,
