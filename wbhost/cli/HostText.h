@@ -1,0 +1,29 @@
+// Texts between the terminal (UTF-8), the host's strings (the default multibyte code page) and
+// UTF-16.
+#pragma once
+
+#include "host/binding/runtime_api.h"
+
+#include <memory>
+#include <string>
+#include <string_view>
+
+namespace wbhost::cli {
+
+// UTF-8 to UTF-16; malformed sequences become U+FFFD. Empty input gives empty output.
+std::u16string FromUtf8(std::string_view text);
+// UTF-16 to UTF-8; unpaired surrogates become U+FFFD.
+std::string ToUtf8(std::u16string_view text);
+
+struct HandleDisposer {
+    void operator()(void** handle) const noexcept;
+};
+// A host handle that this host made and disposes of.
+using OwnedHandle = std::unique_ptr<void*, HandleDisposer>;
+
+// A new host string holding BYTES; null when the host is out of memory.
+OwnedHandle NewHostString(std::string_view bytes);
+// The bytes of a host string; empty for a null handle.
+std::string HostStringBytes(WBHandle handle);
+
+} // namespace wbhost::cli

@@ -1,0 +1,79 @@
+// Reservations of host resource-tree nodes by project items.
+#include "resources/ResourceTree.h"
+
+#include <algorithm>
+
+namespace wbhost::resources {
+namespace {
+
+constexpr uint32_t kSharedMode = 3;
+
+bool Holds(const qv::com::ComPtr<IwbProjectItem>& holder, IwbProjectItem* item) {
+    return holder.Get() == item;
+}
+
+} // namespace
+
+HRESULT ResourceTree::Reserve(wbhw::ResTreeNode& node, IwbProjectItem* item, uint32_t mode) {
+    if (item == nullptr)
+        return E_POINTER;
+    if (mode != kSharedMode)
+        return E_NOTIMPL;
+    const std::lock_guard guard(mutex_);
+    auto& holders = StateOf(node).holders;
+    const auto at = std::find_if(holders.begin(), holders.end(),
+                                 [item](const auto& h) { return Holds(h, item); });
+    if (at == holders.end()) {
+        holders.push_back(qv::com::ComPtr<IwbProjectItem>::Share(item));
+        // Whoever watches the node learns that its holders changed (the new item may be the
+        // second one asking, which the first one's status depends on).
+        Deliver(node, wbhw::node_event::kFromReservation);
+    }
+    // Delivery may have changed the list; the answer is about the list as it is now.
+    const auto& now = StateOf(node).holders;
+    return !now.empty() && Holds(now.front(), item) ? S_OK : S_FALSE;
+}
+
+HRESULT ResourceTree::QueryReservation(wbhw::ResTreeNode& node, IwbProjectItem* item) {
+    if (item == nullptr)
+        return E_POINTER;
+    const std::lock_guard guard(mutex_);
+    const NodeState* state = FindState(node);
+    return state != nullptr && !state->holders.empty() && Holds(state->holders.front(), item)
+               ? S_OK
+               : S_FALSE;
+}
+
+HRESULT ResourceTree::ReleaseReservation(wbhw::ResTreeNode& node, IwbProjectItem* item) {
+    if (item == nullptr)
+        return E_POINTER;
+    const std::lock_guard guard(mutex_);
+    NodeState* state = FindState(node);
+    if (state == nullptr)
+        return S_FALSE;
+    auto& holders = state->holders;
+    const auto at = std::find_if(holders.begin(), holders.end(),
+                                 [item](const auto& h) { return Holds(h, item); });
+    if (at == holders.end())
+        return S_FALSE;
+    // Kept until the list is settled and the watchers told: the item may go with this reference.
+    const qv::com::ComPtr<IwbProjectItem> released = std::move(*at);
+    holders.erase(at);
+    Deliver(node, wbhw::node_event::kFromReservation);
+    return S_OK;
+}
+
+std::vector<IwbProjectItem*> ResourceTree::ReservingItems(wbhw::ResTreeNode& node,
+                                                          IwbProjectItem* except) {
+    const std::lock_guard guard(mutex_);
+    std::vector<IwbProjectItem*> items;
+    if (const NodeState* state = FindState(node)) {
+        for (const auto& holder : state->holders) {
+            if (holder.Get() != except)
+                items.push_back(holder.Get());
+        }
+    }
+    return items;
+}
+
+} // namespace wbhost::resources

@@ -1,0 +1,200 @@
+// The edits of a host resource tree and the change bits each of them raises.
+#include "kern/Collate.h"
+#include "resource_tree/ResTreeWriter.h"
+#include "resources/ResourceTree.h"
+
+namespace wbhost::resources {
+namespace {
+
+using wbhw::ResTreeNode;
+using NodePairs = std::vector<std::pair<ResTreeNode*, ResTreeNode*>>;
+namespace event = wbhw::node_event;
+
+constexpr std::u16string_view kDisplayName = u"DisplayName";
+
+// The entry of NODE that owns CHILD; NODE's End() when none does.
+ResTreeNode::Position EntryOf(const ResTreeNode& node, const ResTreeNode* child) {
+    for (auto entry = node.Begin(); entry != node.End(); ++entry) {
+        if (entry->Child() == child)
+            return entry;
+    }
+    return node.End();
+}
+
+// Copies the entries of FROM into TO in order, recording every node copied with its copy.
+void CopyEntries(ResTreeNode& from, ResTreeNode& to, NodePairs& copies) {
+    for (auto entry = from.Begin(); entry != from.End(); ++entry) {
+        const wbhw::EntryKind kind = entry->Kind();
+        if (wbhw::IsTextKind(kind)) {
+            to.AddText(to.End(), entry->Name(), *entry->Text(), kind);
+        } else if (kind == wbhw::EntryKind::Link) {
+            to.AddLink(to.End(), entry->Name(), *entry->Text());
+        } else if (ResTreeNode* child = entry->Child()) {
+            ResTreeNode* copy =
+                to.AddChild(to.End(), entry->Name(), child->Type(), child->IsOrdered()).node;
+            copies.emplace_back(child, copy);
+            CopyEntries(*child, *copy, copies);
+        }
+    }
+}
+
+// Copies NODE under PARENT as NAME, before BEFORE (ordered parents); the new node, or null when
+// PARENT already holds an entry of that name and keeps names unique.
+ResTreeNode* CopyChild(ResTreeNode& node, ResTreeNode& parent, ResTreeNode::Position before,
+                       const wbhw::WString& name, NodePairs& copies) {
+    const auto added = parent.AddChild(before, name, node.Type(), node.IsOrdered());
+    if (!added.created)
+        return nullptr;
+    copies.emplace_back(&node, added.node);
+    CopyEntries(node, *added.node, copies);
+    return added.node;
+}
+
+} // namespace
+
+HRESULT ResourceTree::SetAttribute(ResTreeNode& node, std::u16string_view name,
+                                   std::u16string_view value) {
+    if (name.empty())
+        return S_FALSE;
+    const std::lock_guard guard(mutex_);
+    const auto found = node.FindLoading(name);
+    uint32_t events = 0;
+    if (found == node.End()) {
+        node.AddText(node.End(), wbhw::WString(name), wbhw::WString(value));
+        events = event::kValueAdded;
+    } else if (node.SetTextAt(found, wbhw::WString(value))) {
+        events = event::kValueChanged;
+    } else {
+        return S_FALSE; // a child or a link of that name: not a property
+    }
+    const bool displayName = qv::kern::EqualsNoCase(name, kDisplayName);
+    ResTreeNode* parent = node.Parent();
+    Deliver(node, events | (displayName ? event::kDisplayName : 0));
+    if (displayName && parent != nullptr && EntryOf(*parent, &node) != parent->End())
+        Deliver(*parent, event::kChildDisplayName);
+    return S_OK;
+}
+
+HRESULT ResourceTree::Rename(ResTreeNode& node, std::u16string_view newName) {
+    if (newName.empty())
+        return E_INVALIDARG;
+    const std::lock_guard guard(mutex_);
+    ResTreeNode* parent = node.Parent();
+    if (parent == nullptr) {
+        node.SetNameAndType(wbhw::WString(newName), node.Type());
+    } else {
+        const auto own = EntryOf(*parent, &node);
+        const auto clash = parent->Find(newName);
+        if (own == parent->End() || (clash != parent->End() && clash != own))
+            return E_INVALIDARG;
+        // An entry's name is its key in the parent, so a renamed node is a copy under the new
+        // name in the old place. The copy is made aside first, since the old entry may hold the
+        // new name already (a change of case only); the states move with the nodes.
+        ResTreeNode aside(u"", u"", true);
+        NodePairs toAside;
+        ResTreeNode* parked = CopyChild(node, aside, aside.End(), node.Name(), toAside);
+        auto next = own;
+        ++next;
+        parent->RemoveAt(own);
+        NodePairs toParent;
+        ResTreeNode* renamed = CopyChild(*parked, *parent, next, wbhw::WString(newName), toParent);
+        if (renamed == nullptr)
+            return E_FAIL; // cannot happen: the name was checked and the old entry is gone
+        NodePairs moved;
+        for (size_t i = 0; i < toAside.size(); ++i)
+            moved.emplace_back(toAside[i].first, toParent[i].second);
+        Rekey(moved);
+        Deliver(*renamed, event::kDisplayName);
+        Deliver(*parent, event::kChildDisplayName);
+        DeliverToDescendants(*renamed, event::kFromAncestor);
+        return S_OK;
+    }
+    Deliver(node, event::kDisplayName);
+    DeliverToDescendants(node, event::kFromAncestor);
+    return S_OK;
+}
+
+void ResourceTree::Rekey(const NodePairs& moved) {
+    for (const auto& [from, to] : moved) {
+        const auto found = states_.find(from);
+        if (found == states_.end())
+            continue;
+        std::shared_ptr<NodeState> state = std::move(found->second);
+        states_.erase(found);
+        state->node = to;
+        states_[to] = std::move(state);
+    }
+}
+
+HRESULT ResourceTree::InsertSubTree(ResTreeNode& node, std::u16string_view xml) {
+    if (xml.empty())
+        return E_INVALIDARG;
+    const std::lock_guard guard(mutex_);
+    // A document that fails half way would leave half a part behind: it is tried aside first.
+    ResTreeNode trial(u"", u"", true);
+    if (trial.ParseText(xml, true) != 0)
+        return E_FAIL;
+    if (node.ParseText(xml, true) != 0)
+        return E_FAIL;
+    Deliver(node, event::kChildAdded);
+    return S_OK;
+}
+
+HRESULT ResourceTree::RemoveChild(ResTreeNode& node, std::u16string_view name) {
+    const std::lock_guard guard(mutex_);
+    const auto found = node.FindLoading(name);
+    if (found == node.End() || found->Child() == nullptr)
+        return S_FALSE;
+    ResTreeNode* child = found->Child();
+    DeliverRemoval(*child);
+    // The observers may have edited the tree meanwhile; the child is looked up again.
+    const auto entry = EntryOf(node, child);
+    if (entry == node.End())
+        return S_OK;
+    const std::vector<NodeState> released = RetireSubtree(*child);
+    node.RemoveAt(entry);
+    Deliver(node, event::kChildRemoved);
+    return S_OK;
+}
+
+void ResourceTree::DeliverRemoval(ResTreeNode& node) {
+    Deliver(node, event::kAboutToBeRemoved);
+    std::vector<ResTreeNode*> below;
+    for (auto entry = node.Begin(); entry != node.End(); ++entry) {
+        if (entry->Child() != nullptr)
+            below.push_back(entry->Child());
+    }
+    for (ResTreeNode* child : below) {
+        if (EntryOf(node, child) != node.End())
+            DeliverRemoval(*child);
+    }
+    Deliver(node, event::kDetached);
+}
+
+std::vector<NodeState> ResourceTree::RetireSubtree(ResTreeNode& node) {
+    std::vector<NodeState> released;
+    std::vector<ResTreeNode*> pending{&node};
+    while (!pending.empty()) {
+        ResTreeNode* at = pending.back();
+        pending.pop_back();
+        for (auto entry = at->Begin(); entry != at->End(); ++entry) {
+            if (entry->Child() != nullptr)
+                pending.push_back(entry->Child());
+        }
+        const auto found = states_.find(at);
+        if (found == states_.end())
+            continue;
+        NodeState& state = *found->second;
+        NodeState dropped;
+        dropped.observers = std::move(state.observers);
+        dropped.holders = std::move(state.holders);
+        state.observers.clear();
+        state.holders.clear();
+        state.node = nullptr;
+        released.push_back(std::move(dropped));
+        states_.erase(found);
+    }
+    return released;
+}
+
+} // namespace wbhost::resources
