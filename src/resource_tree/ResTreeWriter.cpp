@@ -8,6 +8,7 @@
 #include "resource_tree/LoaderText.h"
 #include "resource_tree/TypeRegistry.h"
 
+#include <expat.h>
 #include <map>
 #include <unordered_set>
 #include <vector>
@@ -24,15 +25,30 @@ bool IsNameChar(char16_t c) noexcept {
     return IsNameStart(c) || (c >= u'0' && c <= u'9') || c == u'-' || c == u'.' || c == 0xB7;
 }
 
-// Element names as the loader needs them; names with rarer characters are left to the parser.
-bool IsElementName(std::u16string_view name) noexcept {
+// The parser's classes of name characters beyond ASCII follow tables of their own; such names
+// are checked by letting it read an element of that name.
+bool ParserAcceptsName(std::u16string_view name) {
+    const std::string element = "<" + ToUtf8(name) + "/>";
+    XML_Parser parser = XML_ParserCreate("UTF-8");
+    if (parser == nullptr)
+        return false;
+    const bool ok =
+        XML_Parse(parser, element.data(), static_cast<int>(element.size()), 1) == XML_STATUS_OK;
+    XML_ParserFree(parser);
+    return ok;
+}
+
+// True when NAME can be an element's tag.
+bool IsElementName(std::u16string_view name) {
     if (name.empty() || !IsNameStart(name.front()))
         return false;
+    bool ascii = true;
     for (const char16_t c : name) {
         if (!IsNameChar(c))
             return false;
+        ascii = ascii && c < 0x80;
     }
-    return true;
+    return ascii || ParserAcceptsName(name);
 }
 
 // True when the UTF-16 unit at I (with its pair) is a character XML can carry; ADVANCE tells how

@@ -75,6 +75,9 @@ TEST(ResTreeWriter, WhatCannotComeBackIsFlagged) {
     EXPECT_TRUE(check([](ResTreeNode&) {}));
     EXPECT_FALSE(check([](ResTreeNode& r) { r.SetText(u"1st", u"x"); }));
     EXPECT_FALSE(check([](ResTreeNode& r) { r.SetText(u":Include", u"x"); }));
+    // Beyond ASCII the parser's own name classes decide.
+    EXPECT_FALSE(check([](ResTreeNode& r) { r.SetText(u"Con\uFFFDg", u"x"); }));
+    EXPECT_TRUE(check([](ResTreeNode& r) { r.SetText(u"\u00FCber", u"x"); }));
     EXPECT_FALSE(check([](ResTreeNode& r) { r.SetText(u"V", u"a\u0001b"); }));
     EXPECT_FALSE(check([](ResTreeNode& r) { r.SetText(u"V", u"#{document-root}"); }));
     EXPECT_FALSE(check([](ResTreeNode& r) {
