@@ -20,17 +20,18 @@ HRESULT ResourceTree::Reserve(wbhw::ResTreeNode& node, IwbProjectItem* item, uin
     if (mode != kSharedMode)
         return E_NOTIMPL;
     const std::lock_guard guard(mutex_);
-    auto& holders = StateOf(node).holders;
+    const std::shared_ptr<NodeState> state = Track(node);
+    auto& holders = state->holders;
     const auto at = std::find_if(holders.begin(), holders.end(),
                                  [item](const auto& h) { return Holds(h, item); });
     if (at == holders.end()) {
         holders.push_back(qv::com::ComPtr<IwbProjectItem>::Share(item));
         // Whoever watches the node learns that its holders changed (the new item may be the
         // second one asking, which the first one's status depends on).
-        Deliver(node, wbhw::node_event::kFromReservation);
+        Deliver(state, wbhw::node_event::kFromReservation);
     }
     // Delivery may have changed the list; the answer is about the list as it is now.
-    const auto& now = StateOf(node).holders;
+    const auto& now = state->holders;
     return !now.empty() && Holds(now.front(), item) ? S_OK : S_FALSE;
 }
 
@@ -48,9 +49,9 @@ HRESULT ResourceTree::ReleaseReservation(wbhw::ResTreeNode& node, IwbProjectItem
     if (item == nullptr)
         return E_POINTER;
     const std::lock_guard guard(mutex_);
-    NodeState* state = FindState(node);
-    if (state == nullptr)
+    if (FindState(node) == nullptr)
         return S_FALSE;
+    const std::shared_ptr<NodeState> state = Track(node);
     auto& holders = state->holders;
     const auto at = std::find_if(holders.begin(), holders.end(),
                                  [item](const auto& h) { return Holds(h, item); });
@@ -59,7 +60,7 @@ HRESULT ResourceTree::ReleaseReservation(wbhw::ResTreeNode& node, IwbProjectItem
     // Kept until the list is settled and the watchers told: the item may go with this reference.
     const qv::com::ComPtr<IwbProjectItem> released = std::move(*at);
     holders.erase(at);
-    Deliver(node, wbhw::node_event::kFromReservation);
+    Deliver(state, wbhw::node_event::kFromReservation);
     return S_OK;
 }
 

@@ -13,14 +13,6 @@ constexpr uint32_t kAnyKind = 0xFFFFFFFFu;
 
 using NodeObjectImpl = CQVComObject<HostResourceNode>;
 
-bool HasChild(const wbhw::ResTreeNode& node, const wbhw::ResTreeNode* child) {
-    for (auto entry = node.Begin(); entry != node.End(); ++entry) {
-        if (entry->Child() == child)
-            return true;
-    }
-    return false;
-}
-
 } // namespace
 
 std::shared_ptr<ResourceTree> ResourceTree::Create(std::unique_ptr<wbhw::ResTreeNode> root) {
@@ -150,43 +142,61 @@ void ResourceTree::RestoreNotificationState(wbhw::ResTreeNode& node, uint32_t sa
     StateOf(node).silenced = saved != 0;
 }
 
-void ResourceTree::Deliver(wbhw::ResTreeNode& node, uint32_t events) {
-    NodeState* state = FindState(node);
-    if (state == nullptr || state->silenced || state->observers.empty())
+std::shared_ptr<NodeState> ResourceTree::Track(wbhw::ResTreeNode& node) {
+    StateOf(node);
+    return states_[&node];
+}
+
+void ResourceTree::Deliver(const std::shared_ptr<NodeState>& state, uint32_t events) {
+    if (state == nullptr || state->node == nullptr || state->silenced || state->observers.empty())
         return;
     // Observers may register, unregister or edit the tree while they are called: work from a
     // copy that holds its own references, and skip what was unregistered meanwhile.
     const std::vector<NodeState::Registration> registrations = state->observers;
     qv::com::ComPtr<IwbhwResourceTreeNode> object;
-    if (FAILED(NodeObject(&node, object.Put())))
+    if (FAILED(NodeObject(state->node, object.Put())))
         return;
-    const std::shared_ptr<NodeState> keep = states_[&node];
     for (const auto& r : registrations) {
         const uint32_t due = events & r.mask;
-        if (due == 0)
+        if (due == 0 || state->node == nullptr || state->silenced)
             continue;
-        const auto& now = keep->observers;
+        const auto& now = state->observers;
         const bool stillRegistered = std::any_of(now.begin(), now.end(), [&](const auto& c) {
             return c.observer.Get() == r.observer.Get() && c.kind == r.kind;
         });
-        if (stillRegistered && !keep->silenced)
+        if (stillRegistered)
             r.observer->OnNodeEvent(object.Get(), due, r.kind);
     }
 }
 
-void ResourceTree::DeliverToDescendants(wbhw::ResTreeNode& node, uint32_t events) {
-    std::vector<wbhw::ResTreeNode*> below;
+void ResourceTree::Run(const Plan& plan) {
+    for (const auto& [state, events] : plan)
+        Deliver(state, events);
+}
+
+void ResourceTree::PlanDescendants(wbhw::ResTreeNode& node, uint32_t events, Plan& plan) {
+    for (auto entry = node.Begin(); entry != node.End(); ++entry) {
+        wbhw::ResTreeNode* child = entry->Child();
+        if (child == nullptr)
+            continue;
+        const auto found = states_.find(child);
+        if (found != states_.end() && !found->second->observers.empty())
+            plan.emplace_back(found->second, events);
+        PlanDescendants(*child, events, plan);
+    }
+}
+
+void ResourceTree::PlanRemoval(wbhw::ResTreeNode& node, Plan& plan) {
+    const auto found = states_.find(&node);
+    const bool observed = found != states_.end() && !found->second->observers.empty();
+    if (observed)
+        plan.emplace_back(found->second, wbhw::node_event::kAboutToBeRemoved);
     for (auto entry = node.Begin(); entry != node.End(); ++entry) {
         if (entry->Child() != nullptr)
-            below.push_back(entry->Child());
+            PlanRemoval(*entry->Child(), plan);
     }
-    for (wbhw::ResTreeNode* child : below) {
-        // An observer called for an earlier child may have removed this one.
-        if (!HasChild(node, child))
-            continue;
-        Deliver(*child, events);
-        DeliverToDescendants(*child, events);
-    }
+    if (observed)
+        plan.emplace_back(found->second, wbhw::node_event::kDetached);
 }
 
 void ResourceTree::Shutdown() {

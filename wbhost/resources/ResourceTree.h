@@ -33,6 +33,7 @@ struct NodeState {
     // Reserving items in the order they asked; the first one holds the reservation.
     std::vector<qv::com::ComPtr<IwbProjectItem>> holders;
     bool silenced = false;
+    bool removing = false;              // its removal is being announced
     HostResourceNode* object = nullptr; // the node's COM object while it lives; not owning
 };
 
@@ -101,12 +102,21 @@ public:
 private:
     explicit ResourceTree(std::unique_ptr<wbhw::ResTreeNode> root);
 
+    // Deliveries to make, in order. Observers run in between and may edit the tree, so nodes
+    // are held through their states, which read null once a node is gone.
+    using Plan = std::vector<std::pair<std::shared_ptr<NodeState>, uint32_t>>;
+
     NodeState& StateOf(wbhw::ResTreeNode& node);
     NodeState* FindState(const wbhw::ResTreeNode& node);
-    // Tells NODE's observers of EVENTS, each only of the bits in its mask.
-    void Deliver(wbhw::ResTreeNode& node, uint32_t events);
-    void DeliverToDescendants(wbhw::ResTreeNode& node, uint32_t events);
-    void DeliverRemoval(wbhw::ResTreeNode& node);
+    std::shared_ptr<NodeState> Track(wbhw::ResTreeNode& node);
+    // Tells the observers of the node of STATE (when it still lives) of EVENTS, each only of the
+    // bits in its mask.
+    void Deliver(const std::shared_ptr<NodeState>& state, uint32_t events);
+    void Run(const Plan& plan);
+    // EVENTS for every observed node below NODE, parents before children.
+    void PlanDescendants(wbhw::ResTreeNode& node, uint32_t events, Plan& plan);
+    // 0x400 for NODE, then its descendants' own 0x400 and 0x1, then 0x1 for NODE.
+    void PlanRemoval(wbhw::ResTreeNode& node, Plan& plan);
     // Marks the states of NODE and everything below as gone; answers what they held.
     std::vector<NodeState> RetireSubtree(wbhw::ResTreeNode& node);
     void Rekey(const std::vector<std::pair<wbhw::ResTreeNode*, wbhw::ResTreeNode*>>& moved);

@@ -68,10 +68,10 @@ HRESULT ResourceTree::SetAttribute(ResTreeNode& node, std::u16string_view name,
         return S_FALSE; // a child or a link of that name: not a property
     }
     const bool displayName = qv::kern::EqualsNoCase(name, kDisplayName);
-    ResTreeNode* parent = node.Parent();
-    Deliver(node, events | (displayName ? event::kDisplayName : 0));
-    if (displayName && parent != nullptr && EntryOf(*parent, &node) != parent->End())
-        Deliver(*parent, event::kChildDisplayName);
+    Plan plan{{Track(node), events | (displayName ? event::kDisplayName : 0)}};
+    if (displayName && node.Parent() != nullptr)
+        plan.emplace_back(Track(*node.Parent()), event::kChildDisplayName);
+    Run(plan);
     return S_OK;
 }
 
@@ -104,13 +104,15 @@ HRESULT ResourceTree::Rename(ResTreeNode& node, std::u16string_view newName) {
         for (size_t i = 0; i < toAside.size(); ++i)
             moved.emplace_back(toAside[i].first, toParent[i].second);
         Rekey(moved);
-        Deliver(*renamed, event::kDisplayName);
-        Deliver(*parent, event::kChildDisplayName);
-        DeliverToDescendants(*renamed, event::kFromAncestor);
+        Plan plan{{Track(*renamed), event::kDisplayName},
+                  {Track(*parent), event::kChildDisplayName}};
+        PlanDescendants(*renamed, event::kFromAncestor, plan);
+        Run(plan);
         return S_OK;
     }
-    Deliver(node, event::kDisplayName);
-    DeliverToDescendants(node, event::kFromAncestor);
+    Plan plan{{Track(node), event::kDisplayName}};
+    PlanDescendants(node, event::kFromAncestor, plan);
+    Run(plan);
     return S_OK;
 }
 
@@ -136,7 +138,7 @@ HRESULT ResourceTree::InsertSubTree(ResTreeNode& node, std::u16string_view xml) 
         return E_FAIL;
     if (node.ParseText(xml, true) != 0)
         return E_FAIL;
-    Deliver(node, event::kChildAdded);
+    Deliver(Track(node), event::kChildAdded);
     return S_OK;
 }
 
@@ -145,30 +147,28 @@ HRESULT ResourceTree::RemoveChild(ResTreeNode& node, std::u16string_view name) {
     const auto found = node.FindLoading(name);
     if (found == node.End() || found->Child() == nullptr)
         return S_FALSE;
-    ResTreeNode* child = found->Child();
-    DeliverRemoval(*child);
-    // The observers may have edited the tree meanwhile; the child is looked up again.
-    const auto entry = EntryOf(node, child);
-    if (entry == node.End())
+    const std::shared_ptr<NodeState> child = Track(*found->Child());
+    // Its removal is already being announced: an observer asking again must not start a second
+    // announcement, which would ask again, and so on.
+    if (child->removing)
+        return S_FALSE;
+    Plan plan;
+    PlanRemoval(*child->node, plan);
+    child->removing = true;
+    Run(plan);
+    child->removing = false;
+    // The observers may have edited the tree meanwhile (even removed this part or its parent);
+    // what is left to do is worked out from the tree as it is now.
+    if (child->node == nullptr || child->node->Parent() == nullptr)
         return S_OK;
-    const std::vector<NodeState> released = RetireSubtree(*child);
-    node.RemoveAt(entry);
-    Deliver(node, event::kChildRemoved);
+    ResTreeNode& parent = *child->node->Parent();
+    const auto entry = EntryOf(parent, child->node);
+    if (entry == parent.End())
+        return S_OK;
+    const std::vector<NodeState> released = RetireSubtree(*child->node);
+    parent.RemoveAt(entry);
+    Deliver(Track(parent), event::kChildRemoved);
     return S_OK;
-}
-
-void ResourceTree::DeliverRemoval(ResTreeNode& node) {
-    Deliver(node, event::kAboutToBeRemoved);
-    std::vector<ResTreeNode*> below;
-    for (auto entry = node.Begin(); entry != node.End(); ++entry) {
-        if (entry->Child() != nullptr)
-            below.push_back(entry->Child());
-    }
-    for (ResTreeNode* child : below) {
-        if (EntryOf(node, child) != node.End())
-            DeliverRemoval(*child);
-    }
-    Deliver(node, event::kDetached);
 }
 
 std::vector<NodeState> ResourceTree::RetireSubtree(ResTreeNode& node) {

@@ -1,0 +1,204 @@
+// The host resource tree: which nodes hear which change bits when the tree is edited.
+#include "TestObjects.h"
+#include "host/contracts/IwbhwResourceTreeAccess.h"
+#include "resources/ResourceService.h"
+
+#include <gtest/gtest.h>
+
+namespace {
+
+using qv::com::ComPtr;
+using test::Heard;
+using wbhost::resources::ResourceService;
+using wbhost::resources::ResourceTree;
+
+constexpr uint32_t kAll = 0xFFFFFFFFu;
+
+const char16_t* const kBoard = uR"(<Target name="Board">
+  <Connector name="C0">
+    <DigitalLine name="DIO0"><Line>0</Line><Pins><Pin name="P1"/></Pins></DigitalLine>
+    <DigitalLine name="DIO1"><Line>1</Line></DigitalLine>
+  </Connector>
+</Target>)";
+
+class ResourceTreeTest : public ::testing::Test {
+protected:
+    void SetUp() override {
+        target_ = service_.LoadTargetText(kBoard);
+        ASSERT_NE(target_, nullptr);
+        ASSERT_TRUE(target_->problems.empty());
+        tree_ = target_->tree.get();
+    }
+    wbhw::ResTreeNode& At(std::u16string_view path) {
+        wbhw::ResTreeNode* node = tree_->Find(path);
+        EXPECT_NE(node, nullptr) << std::string(path.begin(), path.end());
+        return *node;
+    }
+    ComPtr<IwbhwResourceTreeNode> Object(std::u16string_view path) {
+        ComPtr<IwbhwResourceTreeNode> object;
+        EXPECT_EQ(tree_->NodeObject(&At(path), object.Put()), S_OK);
+        return object;
+    }
+    // Registers OBSERVER on the node at each path with the mask and kind given.
+    void Watch(test::RecordingObserver* observer, std::initializer_list<std::u16string_view> paths,
+               uint32_t mask = kAll, uint32_t kind = 7) {
+        for (auto path : paths)
+            ASSERT_EQ(Object(path)->AddObserver(observer, mask, kind), S_OK);
+    }
+
+    ResourceService service_;
+    wbhost::resources::Target* target_ = nullptr;
+    ResourceTree* tree_ = nullptr;
+};
+
+TEST_F(ResourceTreeTest, RenameTellsTheNodeItsParentAndEveryDescendant) {
+    auto observer = test::NewObserver();
+    Watch(observer.Get(), {u"C0", u"C0/DIO0", u"C0/DIO0/Pins", u"C0/DIO0/Pins/P1", u"C0/DIO1"});
+    const auto renamedObject = Object(u"C0/DIO0");
+
+    ASSERT_EQ(tree_->Rename(At(u"C0/DIO0"), u"Clock"), S_OK);
+
+    const std::vector<Heard> expected = {
+        {u"/C0/Clock", 0x2, 7},
+        {u"/C0", 0x200, 7},
+        {u"/C0/Clock/Pins", 0x20, 7},
+        {u"/C0/Clock/Pins/P1", 0x20, 7},
+    };
+    EXPECT_EQ(observer->heard, expected);
+    // The node keeps its place, its entries and its COM object; the old name names nothing.
+    EXPECT_EQ(tree_->Find(u"C0/DIO0"), nullptr);
+    EXPECT_EQ(*At(u"C0/Clock").TextAt(u"Line"), u"0");
+    EXPECT_EQ(Object(u"C0/Clock").Get(), renamedObject.Get());
+    EXPECT_EQ(At(u"C0").Begin()->Name(), u"Clock");
+}
+
+TEST_F(ResourceTreeTest, RenameRefusesNamesThatWouldMakeAPathAmbiguous) {
+    EXPECT_EQ(tree_->Rename(At(u"C0/DIO0"), u"dio1"), E_INVALIDARG);
+    EXPECT_EQ(tree_->Rename(At(u"C0/DIO0"), u""), E_INVALIDARG);
+    // A change of case only is a rename of its own.
+    EXPECT_EQ(tree_->Rename(At(u"C0/DIO0"), u"dio0"), S_OK);
+    EXPECT_EQ(At(u"C0/DIO0").Name(), u"dio0");
+}
+
+TEST_F(ResourceTreeTest, RemovalWarnsDetachesThenTellsTheParent) {
+    auto observer = test::NewObserver();
+    Watch(observer.Get(), {u"C0", u"C0/DIO0", u"C0/DIO0/Pins/P1"});
+    const auto removedObject = Object(u"C0/DIO0");
+
+    ASSERT_EQ(Object(u"C0").As<IwbhwResourceTreeAccess>()->RemoveSubTree(u"DIO0"), S_OK);
+
+    const std::vector<Heard> expected = {
+        {u"/C0/DIO0", 0x400, 7},
+        {u"/C0/DIO0/Pins/P1", 0x400, 7},
+        {u"/C0/DIO0/Pins/P1", 0x1, 7},
+        {u"/C0/DIO0", 0x1, 7},
+        {u"/C0", 0x80, 7},
+    };
+    EXPECT_EQ(observer->heard, expected);
+    EXPECT_EQ(tree_->Find(u"C0/DIO0"), nullptr);
+    // A held object of a removed node answers failures, never touches freed memory.
+    BSTR name = nullptr;
+    EXPECT_EQ(removedObject->GetName(&name), E_FAIL);
+    EXPECT_EQ(name, nullptr);
+    EXPECT_EQ(Object(u"C0").As<IwbhwResourceTreeAccess>()->RemoveSubTree(u"DIO0"), S_FALSE);
+}
+
+TEST_F(ResourceTreeTest, InsertAddsTheDocumentBelowAndTellsTheParent) {
+    auto observer = test::NewObserver();
+    Watch(observer.Get(), {u"C0"});
+    const auto access = Object(u"C0").As<IwbhwResourceTreeAccess>();
+
+    ASSERT_EQ(access->InsertSubTree(u"<DigitalLine name=\"DIO2\"><Line>2</Line></DigitalLine>"),
+              S_OK);
+    EXPECT_EQ(observer->heard, (std::vector<Heard>{{u"/C0", 0x100, 7}}));
+    EXPECT_EQ(*At(u"C0/DIO2").TextAt(u"Line"), u"2");
+
+    // A document that does not load leaves nothing half-built behind and says so.
+    observer->heard.clear();
+    const size_t before = At(u"C0").EntryCount();
+    EXPECT_EQ(access->InsertSubTree(u"<DigitalLine name=\"DIO3\"><Line>3</DigitalLine>"), E_FAIL);
+    EXPECT_EQ(At(u"C0").EntryCount(), before);
+    EXPECT_TRUE(observer->heard.empty());
+}
+
+TEST_F(ResourceTreeTest, PropertiesRaiseAddedChangedAndDisplayNameBits) {
+    auto observer = test::NewObserver();
+    Watch(observer.Get(), {u"C0", u"C0/DIO1"});
+    const auto line = Object(u"C0/DIO1");
+
+    EXPECT_EQ(line->SetAttribute(u"Line", u"9"), S_OK);
+    EXPECT_EQ(line->SetAttribute(u"Note", u"spare"), S_OK);
+    EXPECT_EQ(line->SetAttribute(u"DisplayName", u"Spare line"), S_OK);
+    const std::vector<Heard> expected = {
+        {u"/C0/DIO1", 0x4, 7},
+        {u"/C0/DIO1", 0x8, 7},
+        {u"/C0/DIO1", 0x8 | 0x2, 7},
+        {u"/C0", 0x200, 7},
+    };
+    EXPECT_EQ(observer->heard, expected);
+    // A child is not a property: nothing is set, nobody is told.
+    observer->heard.clear();
+    EXPECT_EQ(Object(u"C0")->SetAttribute(u"DIO1", u"x"), S_FALSE);
+    EXPECT_TRUE(observer->heard.empty());
+
+    BSTR value = nullptr;
+    EXPECT_EQ(line->GetAttribute(u"note", &value), S_OK);
+    EXPECT_EQ(qv::com::BstrToString(value), u"spare");
+    SysFreeString(value);
+    EXPECT_EQ(line->GetAttribute(u"Missing", &value), S_FALSE);
+    EXPECT_EQ(value, nullptr);
+}
+
+TEST_F(ResourceTreeTest, MasksKindsAndSilencingDecideWhoHears) {
+    auto observer = test::NewObserver();
+    const auto line = Object(u"C0/DIO1");
+    ASSERT_EQ(line->AddObserver(observer.Get(), 0x4, 1), S_OK);
+    ASSERT_EQ(line->AddObserver(observer.Get(), 0x8 | 0x4, 2), S_OK);
+
+    line->SetAttribute(u"Line", u"5"); // changed: both kinds, each only its own bits
+    line->SetAttribute(u"New", u"1");  // added: kind 2 only
+    EXPECT_EQ(
+        observer->heard,
+        (std::vector<Heard>{{u"/C0/DIO1", 0x4, 1}, {u"/C0/DIO1", 0x4, 2}, {u"/C0/DIO1", 0x8, 2}}));
+
+    observer->heard.clear();
+    uint32_t saved = 99;
+    ASSERT_EQ(line->SaveNotificationState(&saved), S_OK);
+    EXPECT_EQ(saved, 0u);
+    line->SetAttribute(u"Line", u"6");
+    EXPECT_TRUE(observer->heard.empty());
+    ASSERT_EQ(line->RestoreNotificationState(saved), S_OK);
+    line->SetAttribute(u"Line", u"7");
+    EXPECT_EQ(observer->heard.size(), 2u);
+
+    EXPECT_EQ(line->RemoveObserver(observer.Get(), 1, 0), S_OK);
+    EXPECT_EQ(line->RemoveObserver(observer.Get(), 1, 0), S_FALSE);
+}
+
+TEST_F(ResourceTreeTest, RemovingEveryKindBelowANodeLeavesOtherObserversAlone) {
+    auto items = test::NewObserver();
+    auto other = test::NewObserver();
+    Watch(items.Get(), {u"C0/DIO0", u"C0/DIO1"}, kAll, 3);
+    Watch(items.Get(), {u"C0/DIO1"}, kAll, 4);
+    Watch(other.Get(), {u"C0/DIO1"});
+
+    EXPECT_EQ(Object(u"C0")->RemoveObserver(items.Get(), 0xFFFFFFFFu, 1), S_OK);
+    Object(u"C0/DIO0")->SetAttribute(u"Line", u"8");
+    Object(u"C0/DIO1")->SetAttribute(u"Line", u"8");
+    EXPECT_TRUE(items->heard.empty());
+    EXPECT_EQ(other->heard.size(), 1u);
+}
+
+TEST_F(ResourceTreeTest, AnObserverMayEditTheTreeWhileBeingTold) {
+    auto observer = test::NewObserver();
+    Watch(observer.Get(), {u"C0/DIO0", u"C0/DIO1"}, 0x400);
+    // Told that DIO0 goes, the observer removes its sibling too, as an item that cleans up
+    // after itself might.
+    observer->onEvent = [&](IwbhwResourceTreeNode*, uint32_t) {
+        Object(u"C0").As<IwbhwResourceTreeAccess>()->RemoveSubTree(u"DIO1");
+    };
+    ASSERT_EQ(Object(u"C0").As<IwbhwResourceTreeAccess>()->RemoveSubTree(u"DIO0"), S_OK);
+    EXPECT_TRUE(At(u"C0").IsEmpty());
+}
+
+} // namespace
