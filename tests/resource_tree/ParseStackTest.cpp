@@ -136,12 +136,16 @@ TEST(ParseStack, PathTextsAndReferenceLists) {
         <Plain type="path">p/q</Plain>
         <NotAPath type="text">a//b</NotAPath>
         <Module name="m"><Reserves>/a, ../b ,/m/c\,d</Reserves></Module>
+        <Reserves>/m</Reserves>
     </Top>)");
     EXPECT_EQ(TextOf(*root, u"SomePath"), u"a/b/c");
     EXPECT_EQ(TextOf(*root, u"LibDir"), u"/abs/x");
     EXPECT_EQ(TextOf(*root, u"Plain"), u"p/q");
     EXPECT_EQ(TextOf(*root, u"NotAPath"), u"a//b");
     EXPECT_EQ(TextOf(*ChildOf(*root, u"m"), u"Reserves"), u"../a,../b,c\\,d");
+    // Written in the document element, the paths go down from the root and resolve.
+    EXPECT_EQ(TextOf(*root, u"Reserves"), u"m");
+    EXPECT_EQ(root->ReservedNodes(true), std::vector<ResTreeNode*>{ChildOf(*root, u"m")});
 }
 
 TEST(ParseStack, SyntaxErrorsAccumulateWithLineColumnAndContext) {
