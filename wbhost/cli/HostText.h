@@ -15,6 +15,7 @@ std::u16string FromUtf8(std::string_view text);
 // UTF-16 to UTF-8; unpaired surrogates become U+FFFD.
 std::string ToUtf8(std::u16string_view text);
 
+// Gives a handle back to the host (a null handle is ignored by the host).
 struct HandleDisposer {
     void operator()(void** handle) const noexcept;
 };

@@ -14,6 +14,7 @@ public:
     HostedModule(const HostedModule&) = delete;
     HostedModule& operator=(const HostedModule&) = delete;
 
+    // Whether the module is loaded.
     bool Loaded() const noexcept { return handle_ != nullptr; }
     // Why loading failed; empty after a successful load.
     const std::string& Error() const noexcept { return error_; }
