@@ -253,12 +253,12 @@ std::string ToUtf8(std::u16string_view text) {
     size_t ascii = 0;
     while (ascii < text.size() && text[ascii] < 0x80)
         ++ascii;
-    std::string out(ascii, '\0');
+    std::string out;
+    out.reserve(text.size() + (text.size() - ascii) / 2);
     for (size_t i = 0; i < ascii; ++i)
-        out[i] = static_cast<char>(text[i]);
+        out.push_back(static_cast<char>(text[i]));
     if (ascii == text.size())
         return out;
-    out.reserve(text.size() + (text.size() - ascii) / 2);
     for (size_t i = ascii; i < text.size(); ++i) {
         const char16_t c = text[i];
         if (c < 0x80) {

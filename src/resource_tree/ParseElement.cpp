@@ -41,7 +41,9 @@ ParseStack::Frame* ParseStack::ProcessPending(Frame& frame, bool container) {
     const Steering steering = ReadSteering(frame.pendingAttributes);
     const TagInfo& tag = context_.ClassifyTag(frame.pendingName);
     ResTreeNode& node = *frame.node;
-    std::u16string name;
+    // The name lives in the frame (its tag, an attribute or the first of its names) for as long
+    // as the element is processed; one copy less per element.
+    const std::u16string* name = &frame.pendingName;
     bool isNode = false;
     if (steering.names != nullptr) {
         bool truncated = false;
@@ -60,27 +62,26 @@ ParseStack::Frame* ParseStack::ProcessPending(Frame& frame, bool container) {
             frame.ignoreDepth = container ? 2 : 0;
             return nullptr;
         }
-        name = frame.pendingNames.front().name;
+        name = &frame.pendingNames.front().name;
         isNode = true;
     } else if (steering.name != nullptr) {
-        name = *steering.name;
+        name = steering.name;
         isNode = !tag.isLink;
     } else {
-        name = frame.pendingName;
         isNode = steering.prototype != nullptr || container;
     }
     if (isNode)
-        return ProcessNode(frame, container, name, steering, tag);
+        return ProcessNode(frame, container, *name, steering, tag);
     if (container) {
         // A named link whose element holds markup: the markup is no path and must not end the
         // enclosing node's frame, so it is passed over and the link's own text is its path.
         if (!frame.linkChildrenReported)
-            AddError(node, u"Child elements of a :Link element are ignored: " + name);
+            AddError(node, u"Child elements of a :Link element are ignored: " + *name);
         frame.linkChildrenReported = true;
         frame.ignoreDepth = 1;
         return nullptr;
     }
-    ProcessText(frame, name, steering, tag);
+    ProcessText(frame, *name, steering, tag);
     return nullptr;
 }
 

@@ -28,7 +28,9 @@ bool IsNameChar(char16_t c) noexcept {
 // The parser's classes of name characters beyond ASCII follow tables of their own; such names
 // are checked by letting it read an element of that name.
 bool ParserAcceptsName(std::u16string_view name) {
-    const std::string element = "<" + ToUtf8(name) + "/>";
+    std::string element(1, '<');
+    element += ToUtf8(name);
+    element += "/>";
     XML_Parser parser = XML_ParserCreate("UTF-8");
     if (parser == nullptr)
         return false;
