@@ -1,0 +1,21 @@
+// Whole-file reads and writes that never leave a half-written file behind.
+#pragma once
+
+#include <functional>
+#include <string>
+#include <string_view>
+
+namespace wbhost::project {
+
+// Replaces the file PATH by CONTENT: writes a temporary file in the same folder, flushes it to
+// disk, then renames it over PATH and flushes the folder, so PATH is always either the old or
+// the new file. BEFORERENAME (optional) runs between the flush and the rename; answering false
+// stops there as a crash would (the temporary file stays, PATH is untouched) and the call
+// answers false. Otherwise false with a message in ERROR (may be null) on any failure, after
+// removing the temporary file.
+bool WriteFileAtomically(const std::string& path, std::string_view content, std::string* error,
+                         const std::function<bool()>& beforeRename = {});
+// The bytes of the file PATH into CONTENT; false with a message in ERROR (may be null).
+bool ReadWholeFile(const std::string& path, std::string& content, std::string* error);
+
+} // namespace wbhost::project

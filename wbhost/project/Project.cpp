@@ -1,0 +1,195 @@
+// The embedded host's project.
+#include "project/Project.h"
+
+#include "kern/Guid.h"
+#include "kern/Utf8.h"
+#include "project/AtomicFile.h"
+#include "project/ItemUIMap.h"
+
+#include <algorithm>
+#include <functional>
+
+namespace wbhost::project {
+
+using qv::com::ComPtr;
+
+namespace {
+void SetError(std::string* error, std::string message) {
+    if (error != nullptr)
+        *error = std::move(message);
+}
+} // namespace
+
+Project::Project(resources::ResourceService& service, std::u16string name) : service_(service) {
+    ProjectItemObject* root = nullptr;
+    ProjectItemObject::CreateInstance(&root, this, kProjectType, qv::kern::MakeGUID(),
+                                      std::move(name));
+    root_ = ComPtr<ProjectItem>::Adopt(root);
+    CQVComObject<ItemUIMap>* map = nullptr;
+    CQVComObject<ItemUIMap>::CreateInstance(&map);
+    uiMap_ = ComPtr<IwbProjectItemUIMap>::Adopt(map);
+    if (!root_ || !uiMap_)
+        throw std::bad_alloc();
+}
+
+Project::~Project() {
+    for (const auto& target : targets_)
+        if (TargetObject* object = TargetOf(*target.Get()))
+            object->Clear();
+    root_->Close();
+}
+
+TargetObject* Project::TargetOf(const ProjectItem& item) const {
+    const bool isTarget = std::any_of(targets_.begin(), targets_.end(),
+                                      [&](const auto& each) { return each.Get() == &item; });
+    if (!isTarget)
+        return nullptr;
+    const auto change = qv::com::QueryAs<IwbTargetItemChange>(item.Object());
+    return change ? static_cast<TargetObject*>(change.Get()) : nullptr;
+}
+
+ComPtr<ProjectItem> Project::AddTarget(std::u16string name, const std::string& description,
+                                       std::string* error) {
+    ComPtr<ProjectItem> item = root_->AddChild(kTargetType, qv::kern::MakeGUID(), std::move(name));
+    if (!item)
+        throw std::bad_alloc();
+    if (FAILED(AttachTarget(*item.Get(), description, error))) {
+        root_->RemoveChild(item.Get());
+        return {};
+    }
+    return item;
+}
+
+HRESULT Project::AttachTarget(ProjectItem& item, const std::string& description,
+                              std::string* error) {
+    int32_t status = 0;
+    resources::Target* target =
+        description.empty() ? nullptr : service_.LoadTargetFile(description, &status);
+    if (target == nullptr) {
+        SetError(error, "cannot load the resource description \"" + description + "\" of \"" +
+                            qv::kern::WideToUtf8(item.Name()) + "\"");
+        return E_FAIL;
+    }
+    TargetObjectInstance* made = nullptr;
+    if (FAILED(TargetObjectInstance::CreateInstance(&made, target)))
+        throw std::bad_alloc();
+    auto object = ComPtr<TargetObjectInstance>::Adopt(made);
+    item.SetObject(ComPtr<IUnknown>::Share(object->GetUnknown()));
+    item.SetDescriptionFile(description);
+    targets_.push_back(ComPtr<ProjectItem>::Share(&item));
+    return S_OK;
+}
+
+HRESULT Project::MakeObject(ProjectItem& item) {
+    if (IsEqualGUID(item.Type(), wbproj::kFolderType))
+        return S_OK;
+    if (IsEqualGUID(item.Type(), kTargetType) || IsEqualGUID(item.Type(), kProjectType))
+        return E_INVALIDARG;
+    if (!factory_)
+        return S_OK;
+    ComPtr<IUnknown> object;
+    const HRESULT hr = factory_(item, item.Type(), object);
+    if (FAILED(hr))
+        return hr;
+    item.SetObject(std::move(object));
+    return S_OK;
+}
+
+ProjectItem* Project::FindById(const GUID& id) {
+    std::function<ProjectItem*(ProjectItem&)> find = [&](ProjectItem& item) -> ProjectItem* {
+        if (IsEqualGUID(item.Id(), id))
+            return &item;
+        for (const auto& child : item.Children())
+            if (ProjectItem* found = find(*child.Get()))
+                return found;
+        return nullptr;
+    };
+    return find(*root_.Get());
+}
+
+SavedProject Project::Snapshot() const {
+    SavedProject saved;
+    std::function<void(const ProjectItem&, size_t)> add = [&](const ProjectItem& item,
+                                                              size_t parent) {
+        SavedItem entry;
+        entry.id = item.Id();
+        entry.type = item.Type();
+        entry.flags = item.Flags();
+        entry.name = item.Name();
+        entry.parent = parent;
+        entry.descriptionFile = item.DescriptionFile();
+        entry.properties = const_cast<ProjectItem&>(item).Bag().Properties();
+        const size_t index = saved.items.size();
+        saved.items.push_back(std::move(entry));
+        for (const auto& child : item.Children())
+            add(*child.Get(), index);
+    };
+    add(*root_.Get(), SavedItem::kNoParent);
+    return saved;
+}
+
+bool Project::Save(const std::string& path, std::string* error,
+                   const std::function<bool()>& beforeRename) const {
+    return WriteFileAtomically(path, FormatProject(Snapshot()), error, beforeRename);
+}
+
+std::unique_ptr<Project> Project::Open(const std::string& path, resources::ResourceService& service,
+                                       std::string* error, ObjectFactory factory) {
+    std::string text;
+    if (!ReadWholeFile(path, text, error))
+        return nullptr;
+    SavedProject saved;
+    std::string message;
+    if (!ParseProject(text, saved, &message)) {
+        SetError(error, path + ": " + message);
+        return nullptr;
+    }
+    auto project = std::make_unique<Project>(service, saved.items.front().name);
+    project->factory_ = std::move(factory);
+    if (!project->Build(saved, &message)) {
+        SetError(error, path + ": " + message);
+        return nullptr;
+    }
+    return project;
+}
+
+bool Project::Build(const SavedProject& saved, std::string* error) {
+    // The root keeps its saved identity: items refer to their parents by identifier.
+    ProjectItemObject* root = nullptr;
+    ProjectItemObject::CreateInstance(&root, this, saved.items[0].type, saved.items[0].id,
+                                      saved.items[0].name);
+    if (root == nullptr)
+        throw std::bad_alloc();
+    root_->Close();
+    root_ = ComPtr<ProjectItem>::Adopt(root);
+    std::vector<ProjectItem*> made{root_.Get()};
+    for (size_t i = 0; i < saved.items.size(); ++i) {
+        const SavedItem& entry = saved.items[i];
+        ComPtr<ProjectItem> item;
+        if (i == 0) {
+            item = root_;
+        } else {
+            item = made[entry.parent]->AddChild(entry.type, entry.id, entry.name);
+            if (!item)
+                throw std::bad_alloc();
+            made.push_back(item.Get());
+        }
+        item->SetFlags(entry.flags);
+        for (const auto& [name, property] : entry.properties)
+            item->Bag().Put(name, property);
+        if (i == 0)
+            continue;
+        const HRESULT hr = IsEqualGUID(entry.type, kTargetType)
+                               ? AttachTarget(*item.Get(), entry.descriptionFile, error)
+                               : MakeObject(*item.Get());
+        if (FAILED(hr)) {
+            if (error != nullptr && error->empty())
+                *error = "the item \"" + qv::kern::WideToUtf8(entry.name) +
+                         "\" was refused (status " + std::to_string(hr) + ")";
+            return false;
+        }
+    }
+    return true;
+}
+
+} // namespace wbhost::project

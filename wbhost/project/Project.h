@@ -1,0 +1,83 @@
+// A project of the embedded host: a tree of items under a root (targets with their resource
+// trees, folders, and the items providers make), saved to and reopened from a project file.
+#pragma once
+
+#include "framework/com/ComPtr.h"
+#include "host/contracts/IwbProjectItemUIMap.h"
+#include "project/ProjectFormat.h"
+#include "project/ProjectItem.h"
+#include "project/TargetObject.h"
+#include "resources/ResourceService.h"
+
+#include <functional>
+#include <memory>
+#include <string>
+#include <vector>
+
+namespace wbhost::project {
+
+// Item types of the host's own items.
+inline constexpr GUID kProjectType = qv::com::ParseGuid("CD645BF2-83EE-4D8F-9768-1ACEEB221DF0");
+inline constexpr GUID kTargetType = qv::com::ParseGuid("9C188982-C57D-47B0-A23B-2662AE1837CC");
+
+class Project {
+public:
+    // Makes the object of ITEM, whose type is neither a folder nor a target, into OBJECT
+    // (left empty: the item has none). A failure refuses the item.
+    using ObjectFactory = std::function<HRESULT(IwbProjectItem& item, const GUID& type,
+                                                qv::com::ComPtr<IUnknown>& object)>;
+
+    // An empty project called NAME whose targets load through SERVICE (which must outlive it).
+    explicit Project(resources::ResourceService& service, std::u16string name = u"Project");
+    // Closes every item, so references held elsewhere reach detached items.
+    ~Project();
+    Project(const Project&) = delete;
+    Project& operator=(const Project&) = delete;
+
+    // The root item (the project itself).
+    ProjectItem& Root() noexcept { return *root_.Get(); }
+    // Loads the resource description in the file DESCRIPTION and adds it as a target called
+    // NAME under the root. Null, with a message in ERROR (may be null), when it does not load.
+    qv::com::ComPtr<ProjectItem> AddTarget(std::u16string name, const std::string& description,
+                                           std::string* error);
+    // The target items, in the order they were added.
+    const std::vector<qv::com::ComPtr<ProjectItem>>& Targets() const noexcept { return targets_; }
+    // The object of target item ITEM; null for other items.
+    TargetObject* TargetOf(const ProjectItem& item) const;
+
+    // Who makes the objects of items of other types (a provider, or a test); none by default.
+    void SetObjectFactory(ObjectFactory factory) { factory_ = std::move(factory); }
+    // Makes ITEM's object for its type: folders get none, targets cannot be made this way
+    // (E_INVALIDARG: a target needs its description), others go to the factory.
+    HRESULT MakeObject(ProjectItem& item);
+    // The map from information records to objects.
+    const qv::com::ComPtr<IwbProjectItemUIMap>& UIMap() const noexcept { return uiMap_; }
+    // The item with identifier ID, or null.
+    ProjectItem* FindById(const GUID& id);
+
+    // Everything the project file keeps, parents before children.
+    SavedProject Snapshot() const;
+    // Writes the project to PATH atomically (see WriteFileAtomically); false with a message in
+    // ERROR (may be null) when it could not. BEFORERENAME as there.
+    bool Save(const std::string& path, std::string* error,
+              const std::function<bool()>& beforeRename = {}) const;
+    // Reads the project file PATH into a new project whose targets load through SERVICE and
+    // whose other objects FACTORY makes. Null with a message in ERROR (may be null) when the
+    // file cannot be read, is malformed, a target's description does not load or the factory
+    // refuses an item; nothing else is touched then.
+    static std::unique_ptr<Project> Open(const std::string& path,
+                                         resources::ResourceService& service, std::string* error,
+                                         ObjectFactory factory = {});
+
+private:
+    bool Build(const SavedProject& saved, std::string* error);
+    // Loads DESCRIPTION and makes ITEM the target that owns its tree.
+    HRESULT AttachTarget(ProjectItem& item, const std::string& description, std::string* error);
+    resources::ResourceService& service_;
+    qv::com::ComPtr<ProjectItem> root_;
+    qv::com::ComPtr<IwbProjectItemUIMap> uiMap_;
+    std::vector<qv::com::ComPtr<ProjectItem>> targets_;
+    ObjectFactory factory_;
+};
+
+} // namespace wbhost::project

@@ -1,0 +1,89 @@
+// The host's project item: a node of the project tree with its name, type, identifier, flag
+// word, properties and the object its provider made for it.
+#pragma once
+
+#include "framework/com/ComObject.h"
+#include "framework/com/ComPtr.h"
+#include "host/contracts/IwbProjectItem.h"
+#include "project/PropertyBag.h"
+
+#include <string>
+#include <vector>
+
+namespace wbhost::project {
+
+class Project;
+
+class ProjectItem : public IwbProjectItem {
+public:
+    using Interfaces = qv::com::InterfaceList<IwbProjectItem>;
+    // An item of PROJECT (not owning; cleared by Close) with TYPE, identifier ID and NAME,
+    // shown, without parent or object.
+    ProjectItem(Project* project, const GUID& type, const GUID& id, std::u16string name);
+    virtual ~ProjectItem() = default;
+    // Makes the property bag.
+    HRESULT FinalConstruct();
+
+    HRESULT GetName(BSTR* name) override;
+    HRESULT SetName(const char16_t* name) override;
+    HRESULT GetTypeGuid(GUID* type) override;
+    HRESULT GetParent(IwbProjectItem** parent) override;
+    HRESULT FindChild(const char16_t* name, IwbProjectItem** child) override;
+    HRESULT CreateChild(const GUID& type, const char16_t* name, IwbProjectItem** child) override;
+    HRESULT GetObject(IUnknown** object) override;
+    HRESULT GetPropertyBag(IwbProjectPropertyBag** bag) override;
+    HRESULT Refresh(uint32_t updateCode) override;
+    HRESULT Select() override;
+    HRESULT Show(int32_t show) override;
+    HRESULT GetFlags(uint32_t* flags) override;
+    HRESULT SetFlags(uint32_t flags) override;
+    HRESULT EnumerateItems(IwbProjectItemSelector* selector, IwbProjectItem** selected) override;
+    HRESULT GetInfoRecord(QxItemInfoRecord* record) override;
+    HRESULT GetItemUIMap(IwbProjectItemUIMap** map) override;
+
+    // Host side.
+    const std::u16string& Name() const noexcept { return name_; }
+    const GUID& Type() const noexcept { return type_; }
+    const GUID& Id() const noexcept { return id_; }
+    uint32_t Flags() const noexcept { return flags_; }
+    ProjectItem* Parent() const noexcept { return parent_; }
+    const std::vector<qv::com::ComPtr<ProjectItem>>& Children() const noexcept { return children_; }
+    PropertyBag& Bag() noexcept { return *bag_.Get(); }
+    IUnknown* Object() const noexcept { return object_.Get(); }
+    void SetObject(qv::com::ComPtr<IUnknown> object) { object_ = std::move(object); }
+    // The resource description a target item was loaded from; empty for other items.
+    const std::string& DescriptionFile() const noexcept { return descriptionFile_; }
+    void SetDescriptionFile(std::string path) { descriptionFile_ = std::move(path); }
+    // Appends a new child of TYPE with ID and NAME and answers it (null without memory); no
+    // object is made for it.
+    qv::com::ComPtr<ProjectItem> AddChild(const GUID& type, const GUID& id, std::u16string name);
+    // Removes CHILD from the children and closes it; false when it is not a child.
+    bool RemoveChild(ProjectItem* child);
+    // Lets go of the object, the children (closing them) and the parent and project links, so
+    // references still held elsewhere reach a detached item instead of freed memory.
+    void Close();
+
+    // What the project tree was asked to do, for tests.
+    const std::vector<uint32_t>& Refreshes() const noexcept { return refreshes_; }
+    int SelectCount() const noexcept { return selects_; }
+    int32_t LastShow() const noexcept { return lastShow_; }
+
+private:
+    Project* project_;
+    ProjectItem* parent_ = nullptr;
+    const GUID type_;
+    const GUID id_;
+    std::u16string name_;
+    uint32_t flags_ = wbproj::kShownFlag;
+    qv::com::ComPtr<PropertyBag> bag_;
+    qv::com::ComPtr<IUnknown> object_;
+    std::vector<qv::com::ComPtr<ProjectItem>> children_;
+    std::string descriptionFile_;
+    std::vector<uint32_t> refreshes_;
+    int selects_ = 0;
+    int32_t lastShow_ = 0;
+};
+
+using ProjectItemObject = CQVComObject<ProjectItem>;
+
+} // namespace wbhost::project
