@@ -69,7 +69,9 @@ TEST_F(ProjectFormatTest, EverythingReadsBackUnchanged) {
     std::vector<std::u16string> seenAtCreation;
     auto reopened = Project::Open(
         path, service, &error,
-        [&](IwbProjectItem& made, const GUID& type, ComPtr<IUnknown>& object) -> HRESULT {
+        [&](IwbProjectItem& made, const GUID& type, IUnknown* state,
+            ComPtr<IUnknown>& object) -> HRESULT {
+            EXPECT_TRUE(qv::com::QueryAs<IwbProjectPropertyBag>(state)); // reloaded, not new
             EXPECT_TRUE(IsEqualGUID(type, kItemType));
             IwbProjectPropertyBag* madeBag = nullptr;
             made.GetPropertyBag(&madeBag);
@@ -228,10 +230,9 @@ TEST_F(ProjectFormatTest, AFailedOpenLeavesTheOpenProjectAlone) {
     EXPECT_FALSE(Project::Open(path, service, &error));
     EXPECT_NE(error.find("t.xml"), std::string::npos) << error;
     scratch.Write("t.xml", kDescription);
-    EXPECT_FALSE(
-        Project::Open(path, service, &error, [](IwbProjectItem&, const GUID&, ComPtr<IUnknown>&) {
-            return E_ACCESSDENIED;
-        }));
+    EXPECT_FALSE(Project::Open(
+        path, service, &error,
+        [](IwbProjectItem&, const GUID&, IUnknown*, ComPtr<IUnknown>&) { return E_ACCESSDENIED; }));
     EXPECT_NE(error.find("Item"), std::string::npos) << error;
 
     int32_t value = 0;

@@ -82,10 +82,11 @@ TEST_F(ProjectItemTest, TreeOperations) {
 
 TEST_F(ProjectItemTest, InfoRecordAndObjectMap) {
     auto scope = Make<ScopeObjectImpl>();
-    project->SetObjectFactory([&](IwbProjectItem&, const GUID&, ComPtr<IUnknown>& object) {
-        object = ComPtr<IUnknown>::Share(scope->GetUnknown());
-        return S_OK;
-    });
+    project->SetObjectFactory(
+        [&](IwbProjectItem&, const GUID&, IUnknown*, ComPtr<IUnknown>& object) {
+            object = ComPtr<IUnknown>::Share(scope->GetUnknown());
+            return S_OK;
+        });
     constexpr GUID kType = qv::com::ParseGuid("11111111-2222-3333-4444-555555555555");
     auto item = Child(root, u"Item", kType);
     QxItemInfoRecord record;
@@ -146,10 +147,11 @@ TEST_F(ProjectItemTest, PropertiesAreTypedAndAbsentAnswersFalse) {
 
 TEST_F(ProjectItemTest, EnumerationStopsAtSelectionAndSkipsBelowScopes) {
     auto scope = Make<ScopeObjectImpl>();
-    project->SetObjectFactory([&](IwbProjectItem&, const GUID&, ComPtr<IUnknown>& object) {
-        object = ComPtr<IUnknown>::Share(scope->GetUnknown());
-        return S_OK;
-    });
+    project->SetObjectFactory(
+        [&](IwbProjectItem&, const GUID&, IUnknown*, ComPtr<IUnknown>& object) {
+            object = ComPtr<IUnknown>::Share(scope->GetUnknown());
+            return S_OK;
+        });
     constexpr GUID kScopeType = qv::com::ParseGuid("11111111-2222-3333-4444-555555555555");
     auto a = Child(root, u"A");
     Child(*a.Get(), u"A1");
@@ -235,7 +237,7 @@ TEST_F(ProjectItemTest, RefusedObjectsDropTheItemAndClosingFreesCycles) {
         auto closing = std::make_unique<Project>(own);
         constexpr GUID kType = qv::com::ParseGuid("11111111-2222-3333-4444-555555555555");
         closing->SetObjectFactory(
-            [&](IwbProjectItem& item, const GUID&, ComPtr<IUnknown>& object) -> HRESULT {
+            [&](IwbProjectItem& item, const GUID&, IUnknown*, ComPtr<IUnknown>& object) -> HRESULT {
                 if (NameOf(&item) == u"Refused")
                     return E_ACCESSDENIED;
                 object = ComPtr<IUnknown>::Share(Make<PlainObjectImpl>(&item)->GetUnknown());

@@ -80,7 +80,7 @@ HRESULT Project::AttachTarget(ProjectItem& item, const std::string& description,
     return S_OK;
 }
 
-HRESULT Project::MakeObject(ProjectItem& item) {
+HRESULT Project::MakeObject(ProjectItem& item, bool reloaded) {
     if (IsEqualGUID(item.Type(), wbproj::kFolderType))
         return S_OK;
     if (IsEqualGUID(item.Type(), kTargetType) || IsEqualGUID(item.Type(), kProjectType))
@@ -88,7 +88,8 @@ HRESULT Project::MakeObject(ProjectItem& item) {
     if (!factory_)
         return S_OK;
     ComPtr<IUnknown> object;
-    const HRESULT hr = factory_(item, item.Type(), object);
+    IUnknown* const state = reloaded ? static_cast<IUnknown*>(&item.Bag()) : nullptr;
+    const HRESULT hr = factory_(item, item.Type(), state, object);
     if (FAILED(hr))
         return hr;
     item.SetObject(std::move(object));
@@ -181,7 +182,7 @@ bool Project::Build(const SavedProject& saved, std::string* error) {
             continue;
         const HRESULT hr = IsEqualGUID(entry.type, kTargetType)
                                ? AttachTarget(*item.Get(), entry.descriptionFile, error)
-                               : MakeObject(*item.Get());
+                               : MakeObject(*item.Get(), true);
         if (FAILED(hr)) {
             if (error != nullptr && error->empty())
                 *error = "the item \"" + qv::kern::WideToUtf8(entry.name) +

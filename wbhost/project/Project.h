@@ -23,9 +23,11 @@ inline constexpr GUID kTargetType = qv::com::ParseGuid("9C188982-C57D-47B0-A23B-
 class Project {
 public:
     // Makes the object of ITEM, whose type is neither a folder nor a target, into OBJECT
-    // (left empty: the item has none). A failure refuses the item.
-    using ObjectFactory = std::function<HRESULT(IwbProjectItem& item, const GUID& type,
-                                                qv::com::ComPtr<IUnknown>& object)>;
+    // (left empty: the item has none). SAVEDSTATE is the item's reloaded property bag when the
+    // project is being opened, null for a new item. A failure refuses the item.
+    using ObjectFactory =
+        std::function<HRESULT(IwbProjectItem& item, const GUID& type, IUnknown* savedState,
+                              qv::com::ComPtr<IUnknown>& object)>;
 
     // An empty project called NAME whose targets load through SERVICE (which must outlive it).
     explicit Project(resources::ResourceService& service, std::u16string name = u"Project");
@@ -48,8 +50,9 @@ public:
     // Who makes the objects of items of other types (a provider, or a test); none by default.
     void SetObjectFactory(ObjectFactory factory) { factory_ = std::move(factory); }
     // Makes ITEM's object for its type: folders get none, targets cannot be made this way
-    // (E_INVALIDARG: a target needs its description), others go to the factory.
-    HRESULT MakeObject(ProjectItem& item);
+    // (E_INVALIDARG: a target needs its description), others go to the factory, with the
+    // item's bag as saved state when RELOADED.
+    HRESULT MakeObject(ProjectItem& item, bool reloaded = false);
     // The map from information records to objects.
     const qv::com::ComPtr<IwbProjectItemUIMap>& UIMap() const noexcept { return uiMap_; }
     // The item with identifier ID, or null.
