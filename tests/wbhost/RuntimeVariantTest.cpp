@@ -1,0 +1,153 @@
+// Variant attributes as the I/O name control reads and writes them, and the host objects of the
+// runtime (target items and online help).
+#include "TestObjects.h"
+#include "runtime/HostObjects.h"
+#include "runtime/HostStrings.h"
+#include "runtime/Runtime.h"
+#include "runtime/VariantTable.h"
+
+#include <cstring>
+#include <gtest/gtest.h>
+
+namespace {
+
+using wbhost::runtime::ReadHostString;
+using wbhost::runtime::StoreHostString;
+
+// A Pascal-string attribute name.
+struct Name {
+    explicit Name(std::string_view text) : bytes(1, static_cast<unsigned char>(text.size())) {
+        bytes.insert(bytes.end(), text.begin(), text.end());
+    }
+    const unsigned char* get() const { return bytes.data(); }
+    std::basic_string<unsigned char> bytes;
+};
+
+WBErr SetText(WBVariant variant, std::string_view name, std::string_view text) {
+    WBHandle value = nullptr;
+    EXPECT_EQ(StoreHostString(&value, text), kWBNoErr);
+    const WBErr err = WbVariantPStrSetStringAttr(variant, Name(name).get(), value);
+    DSDisposeHandle(value);
+    return err;
+}
+
+std::string GetText(WBVariant variant, std::string_view name, WBErr expected = kWBNoErr) {
+    WBHandle value = nullptr;
+    EXPECT_EQ(WbVariantPStrGetStringAttr(variant, Name(name).get(), &value), expected);
+    std::string text = ReadHostString(value).value_or("<none>");
+    DSDisposeHandle(value);
+    return text;
+}
+
+TEST(RuntimeVariant, NestedAttributesReadAsCopiesOfTheirOwn) {
+    const size_t live = wbhost::runtime::VariantTable::Instance().LiveCount();
+    WBVariant data = WbVariantCreate();
+    WBVariant tdData = WbVariantCreate();
+    ASSERT_EQ(SetText(tdData, "IOInterface", "DigitalLine"), kWBNoErr);
+    ASSERT_EQ(WbVariantPStrSetWbVariantAttr(data, Name("tdData").get(), tdData), kWBNoErr);
+    // The holder keeps what tdData was when it was set.
+    ASSERT_EQ(SetText(tdData, "IOInterface", "Changed"), kWBNoErr);
+    ASSERT_EQ(WbVariantDestroy(tdData), kWBNoErr);
+
+    WBVariant read = nullptr;
+    ASSERT_EQ(WbVariantPStrGetWbVariantAttr(data, Name("tdData").get(), &read), kWBNoErr);
+    EXPECT_EQ(GetText(read, "IOInterface"), "DigitalLine");
+    ASSERT_EQ(SetText(read, "IOInterface", "Mine"), kWBNoErr);
+    WBVariant again = nullptr;
+    ASSERT_EQ(WbVariantPStrGetWbVariantAttr(data, Name("tdData").get(), &again), kWBNoErr);
+    EXPECT_EQ(GetText(again, "IOInterface"), "DigitalLine");
+
+    // A variant may hold a copy of itself.
+    ASSERT_EQ(WbVariantPStrSetWbVariantAttr(read, Name("self").get(), read), kWBNoErr);
+    EXPECT_EQ(WbVariantDestroy(read), kWBNoErr);
+    EXPECT_EQ(WbVariantDestroy(again), kWBNoErr);
+    EXPECT_EQ(WbVariantDestroy(data), kWBNoErr);
+    EXPECT_EQ(wbhost::runtime::VariantTable::Instance().LiveCount(), live);
+}
+
+TEST(RuntimeVariant, OneNameOneAttributeOfAnyKind) {
+    WBVariant element = WbVariantCreate();
+    ASSERT_EQ(SetText(element, "n", "Connector0/DIO0"), kWBNoErr);
+    // A string is read into a host string of the caller's, which grows to fit.
+    WBHandle value = DSNewHandle(259);
+    ASSERT_EQ(StoreHostString(&value, ""), kWBNoErr);
+    ASSERT_EQ(WbVariantPStrGetStringAttr(element, Name("n").get(), &value), kWBNoErr);
+    EXPECT_EQ(ReadHostString(value), "Connector0/DIO0");
+    DSDisposeHandle(value);
+
+    uint32_t flag = 0;
+    EXPECT_EQ(WbVariantPStrGetUI32Attr(element, Name("n").get(), &flag), kWBAttrMissing);
+    ASSERT_EQ(WbVariantPStrSetUI32Attr(element, Name("f").get(), 1), kWBNoErr);
+    EXPECT_EQ(WbVariantPStrGetUI32Attr(element, Name("f").get(), &flag), kWBNoErr);
+    EXPECT_EQ(flag, 1u);
+    EXPECT_EQ(GetText(element, "f", kWBAttrMissing), "<none>");
+    EXPECT_EQ(GetText(element, "oldValue", kWBAttrMissing), "<none>");
+    WBVariant none = element;
+    EXPECT_EQ(WbVariantPStrGetWbVariantAttr(element, Name("n").get(), &none), kWBAttrMissing);
+    EXPECT_EQ(none, nullptr);
+    ASSERT_EQ(SetText(element, "f", "replaced"), kWBNoErr);
+    EXPECT_EQ(GetText(element, "f"), "replaced");
+    WbVariantDestroy(element);
+}
+
+TEST(RuntimeVariant, BadArgumentsGetHostErrors) {
+    WBVariant variant = WbVariantCreate();
+    const Name name("n");
+    WBHandle value = nullptr;
+    StoreHostString(&value, "x");
+    EXPECT_EQ(WbVariantPStrSetStringAttr(variant, nullptr, value), kWBArgErr);
+    EXPECT_EQ(WbVariantPStrSetStringAttr(variant, Name("").get(), value), kWBArgErr);
+    EXPECT_EQ(WbVariantPStrSetStringAttr(nullptr, name.get(), value), kWBArgErr);
+    EXPECT_EQ(WbVariantPStrSetStringAttr(variant, name.get(), nullptr), kWBArgErr);
+    // A host string whose count claims more than its block holds is refused, not over-read.
+    const int32_t lie = 1000;
+    std::memcpy(*value, &lie, sizeof lie);
+    EXPECT_EQ(WbVariantPStrSetStringAttr(variant, name.get(), value), kWBArgErr);
+    DSDisposeHandle(value);
+    EXPECT_EQ(WbVariantPStrSetStringAttr(variant, name.get(), value), kWBArgErr);
+
+    EXPECT_EQ(WbVariantPStrGetStringAttr(variant, name.get(), nullptr), kWBArgErr);
+    EXPECT_EQ(WbVariantPStrGetUI32Attr(variant, name.get(), nullptr), kWBArgErr);
+    EXPECT_EQ(WbVariantPStrSetWbVariantAttr(variant, name.get(), nullptr), kWBArgErr);
+    ASSERT_EQ(WbVariantDestroy(variant), kWBNoErr);
+    EXPECT_EQ(WbVariantDestroy(variant), kWBArgErr);
+    EXPECT_EQ(WbVariantPStrSetUI32Attr(variant, name.get(), 1), kWBArgErr);
+    EXPECT_EQ(WbVariantDestroy(nullptr), kWBArgErr);
+}
+
+TEST(RuntimeHostObjects, TargetItemsComeFromTheProjectOnly) {
+    void* item = &item;
+    EXPECT_EQ(TargetItemFromAppRef(7, &item), kWBGenericErr);
+    EXPECT_EQ(item, nullptr);
+    EXPECT_EQ(TargetItemFromAppRef(7, nullptr), kWBArgErr);
+
+    auto target = test::NewItem();
+    wbhost::runtime::SetTargetItemResolver([&](WBRefNum appRef, void** out) -> WBErr {
+        if (appRef != 7) {
+            *out = target.Get(); // a resolver that fails must not hand anything out
+            return kWBArgErr;
+        }
+        target->AddRef();
+        *out = static_cast<IwbProjectItem*>(target.Get());
+        return kWBNoErr;
+    });
+    ASSERT_EQ(TargetItemFromAppRef(7, &item), kWBNoErr);
+    EXPECT_EQ(item, static_cast<IwbProjectItem*>(target.Get()));
+    static_cast<IUnknown*>(item)->Release();
+    EXPECT_EQ(TargetItemFromAppRef(8, &item), kWBArgErr);
+    EXPECT_EQ(item, nullptr);
+    wbhost::runtime::SetTargetItemResolver(nullptr);
+}
+
+TEST(RuntimeHostObjects, HelpRequestsAreRecorded) {
+    wbhost::runtime::ClearHelpRequests();
+    EXPECT_EQ(ControlOnlineHelp(5, "/opt/host/help/concepts.chm", "Basic_IO.html"), kWBNoErr);
+    EXPECT_EQ(ControlOnlineHelp(1, nullptr, nullptr), kWBNoErr);
+    using wbhost::runtime::HelpRequest;
+    EXPECT_EQ(wbhost::runtime::HelpRequests(),
+              (std::vector<HelpRequest>{{5, "/opt/host/help/concepts.chm", "Basic_IO.html"},
+                                        {1, "", ""}}));
+    wbhost::runtime::ClearHelpRequests();
+}
+
+} // namespace
