@@ -1,47 +1,12 @@
 // Text helpers shared by the attribute-bag and cluster-XML forms.
 #include "attribute_bag/XmlText.h"
 
+#include "resource_tree/XmlEscape.h"
+
 #include <unicode/ustring.h>
 
 namespace wbhw {
 namespace {
-
-// Appends one character, written as an entity or reference when it needs one. ATTRIBUTE selects
-// the quoted-attribute rules.
-void AppendEscaped(char16_t c, bool attribute, std::u16string& out) {
-    switch (c) {
-    case u'&':
-        out += u"&amp;";
-        return;
-    case u'<':
-        out += u"&lt;";
-        return;
-    case u'>':
-        out += u"&gt;";
-        return;
-    case u'\r':
-        out += u"&#13;";
-        return;
-    default:
-        break;
-    }
-    if (attribute) {
-        switch (c) {
-        case u'"':
-            out += u"&quot;";
-            return;
-        case u'\t':
-            out += u"&#9;";
-            return;
-        case u'\n':
-            out += u"&#10;";
-            return;
-        default:
-            break;
-        }
-    }
-    out += c;
-}
 
 // True for a UTF-16 unit that XML 1.0 forbids everywhere, even as a character reference.
 bool IsForbiddenInXml(char16_t c) noexcept {
@@ -76,12 +41,12 @@ bool ConvertToUtf8(std::u16string_view wide, std::string& out, bool substitute) 
 
 void AppendEscapedText(std::u16string_view text, std::u16string& out) {
     for (const char16_t c : text)
-        AppendEscaped(c, false, out);
+        AppendXmlEscaped(c, false, out);
 }
 
 void AppendEscapedAttribute(std::u16string_view text, std::u16string& out) {
     for (const char16_t c : text)
-        AppendEscaped(c, true, out);
+        AppendXmlEscaped(c, true, out);
 }
 
 std::string ToXmlUtf8Lenient(std::u16string_view wide) {

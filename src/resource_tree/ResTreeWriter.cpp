@@ -7,6 +7,7 @@
 #include "resource_tree/LoadContext.h"
 #include "resource_tree/LoaderText.h"
 #include "resource_tree/TypeRegistry.h"
+#include "resource_tree/XmlEscape.h"
 
 #include <expat.h>
 #include <map>
@@ -96,33 +97,10 @@ private:
                 i += advance;
                 continue;
             }
-            const char16_t c = text[i];
-            switch (c) {
-            case u'&':
-                out_ += u"&amp;";
-                break;
-            case u'<':
-                out_ += u"&lt;";
-                break;
-            case u'>':
-                out_ += u"&gt;";
-                break;
-            case u'"':
-                out_ += attribute ? u"&quot;" : u"\"";
-                break;
-            case u'\r':
-                out_ += u"&#13;";
-                break;
-            case u'\t':
-                out_ += attribute ? u"&#9;" : u"\t";
-                break;
-            case u'\n':
-                out_ += attribute ? u"&#10;" : u"\n";
-                break;
-            default:
-                out_.append(text.substr(i, advance));
-                break;
-            }
+            if (advance == 1)
+                AppendXmlEscaped(text[i], attribute, out_);
+            else
+                out_.append(text.substr(i, advance)); // a surrogate pair needs no escaping
             i += advance;
         }
     }
