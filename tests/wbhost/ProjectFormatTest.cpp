@@ -39,7 +39,9 @@ protected:
 TEST_F(ProjectFormatTest, EverythingReadsBackUnchanged) {
     Project project(service, u"My Project");
     std::string error;
-    auto target = project.AddTarget(u"Target A", scratch.Write("t.xml", kDescription), &error);
+    // A file name that is not valid UTF-16 material: kept as bytes.
+    auto target = project.AddTarget(
+        u"Target A", scratch.Write("t \xF0\x9F\x98\x80\xFF.xml", kDescription), &error);
     ASSERT_TRUE(target) << error;
     IwbProjectItem* folder = nullptr;
     ASSERT_EQ(target->CreateChild(wbproj::kFolderType, u"Folder with spaces", &folder), S_OK);

@@ -119,7 +119,7 @@ SavedProject Project::Snapshot() const {
         entry.name = item.Name();
         entry.parent = parent;
         entry.descriptionFile = item.DescriptionFile();
-        entry.properties = const_cast<ProjectItem&>(item).Bag().Properties();
+        entry.properties = item.Bag().Properties();
         const size_t index = saved.items.size();
         saved.items.push_back(std::move(entry));
         for (const auto& child : item.Children())

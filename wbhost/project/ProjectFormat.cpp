@@ -107,10 +107,10 @@ private:
         SavedItem* item = Find(fields[1]);
         if (item == nullptr)
             return "target of an unknown item";
-        std::u16string file;
-        if (!UnescapeField(fields[2], file) || file.empty() || !item->descriptionFile.empty())
+        std::string file;
+        if (!UnescapeBytes(fields[2], file) || file.empty() || !item->descriptionFile.empty())
             return "malformed or repeated description file";
-        item->descriptionFile = qv::kern::WideToUtf8(file);
+        item->descriptionFile = std::move(file);
         return {};
     }
 
@@ -158,11 +158,15 @@ private:
 } // namespace
 
 std::string EscapeField(std::u16string_view text) {
-    if (text.empty())
+    return EscapeBytes(qv::kern::WideToUtf8(text));
+}
+
+std::string EscapeBytes(std::string_view bytes) {
+    if (bytes.empty())
         return "\\e";
     static constexpr char kDigits[] = "0123456789ABCDEF";
     std::string out;
-    for (const char c : qv::kern::WideToUtf8(text)) {
+    for (const char c : bytes) {
         const auto byte = static_cast<unsigned char>(c);
         if (c == '\\') {
             out += "\\\\";
@@ -180,13 +184,23 @@ std::string EscapeField(std::u16string_view text) {
 }
 
 bool UnescapeField(std::string_view field, std::u16string& text) {
+    std::string bytes;
+    if (!UnescapeBytes(field, bytes))
+        return false;
+    try {
+        text = qv::kern::Utf8ToWide(bytes);
+        return true;
+    } catch (...) {
+        return false;
+    }
+}
+
+bool UnescapeBytes(std::string_view field, std::string& bytes) {
+    bytes.clear();
     if (field.empty())
         return false;
-    if (field == "\\e") {
-        text.clear();
+    if (field == "\\e")
         return true;
-    }
-    std::string bytes;
     for (size_t i = 0; i < field.size(); ++i) {
         if (field[i] != '\\') {
             bytes += field[i];
@@ -208,12 +222,7 @@ bool UnescapeField(std::string_view field, std::u16string& text) {
             return false;
         }
     }
-    try {
-        text = qv::kern::Utf8ToWide(bytes);
-        return true;
-    } catch (...) {
-        return false;
-    }
+    return true;
 }
 
 std::string FormatProject(const SavedProject& project) {
@@ -228,8 +237,7 @@ std::string FormatProject(const SavedProject& project) {
         out += "item " + id + ' ' + parent + ' ' + qv::kern::GuidToNarrowString(item.type) + ' ' +
                FlagsText(item.flags) + ' ' + EscapeField(item.name) + '\n';
         if (!item.descriptionFile.empty())
-            out += "target " + id + ' ' + EscapeField(qv::kern::Utf8ToWide(item.descriptionFile)) +
-                   '\n';
+            out += "target " + id + ' ' + EscapeBytes(item.descriptionFile) + '\n';
         for (const auto& [name, property] : item.properties) {
             const std::string prefix = ' ' + id + ' ' + EscapeField(name) + ' ';
             switch (property.kind) {

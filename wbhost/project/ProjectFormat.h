@@ -2,7 +2,7 @@
 //
 //   wbhost-project 1
 //   item ID PARENT TYPE FLAGS NAME      PARENT is "-" for the root (the first item only)
-//   target ID FILE                      the resource description of target item ID
+//   target ID FILE                      the resource description of target item ID (bytes)
 //   string ID NAME VALUE
 //   int ID NAME DECIMAL
 //   bool ID NAME 0|1
@@ -52,5 +52,8 @@ bool ParseProject(std::string_view text, SavedProject& project, std::string* err
 std::string EscapeField(std::u16string_view text);
 // The text of FIELD; false when it holds a malformed escape or UTF-8.
 bool UnescapeField(std::string_view field, std::u16string& text);
+// The same for bytes kept as they are (file names): no UTF-8 involved.
+std::string EscapeBytes(std::string_view bytes);
+bool UnescapeBytes(std::string_view field, std::string& bytes);
 
 } // namespace wbhost::project

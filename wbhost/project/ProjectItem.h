@@ -49,6 +49,7 @@ public:
     ProjectItem* Parent() const noexcept { return parent_; }
     const std::vector<qv::com::ComPtr<ProjectItem>>& Children() const noexcept { return children_; }
     PropertyBag& Bag() noexcept { return *bag_.Get(); }
+    const PropertyBag& Bag() const noexcept { return *bag_.Get(); }
     IUnknown* Object() const noexcept { return object_.Get(); }
     void SetObject(qv::com::ComPtr<IUnknown> object) { object_ = std::move(object); }
     // The resource description a target item was loaded from; empty for other items.
