@@ -126,6 +126,13 @@ HRESULT HostProgramImpl::GetOutputStringList(uint32_t index, BSTR** array, uint3
         }
         for (size_t i = 0; i < texts->size(); ++i) {
             list[i] = qv::com::AllocBstr((*texts)[i]);
+            if (!list[i]) { // a list with a text missing would read as a shorter one
+                for (size_t j = 0; j < i; ++j) {
+                    SysFreeString(list[j]);
+                }
+                CoTaskMemFree(list);
+                return E_OUTOFMEMORY;
+            }
         }
         *array = list;
         *count = static_cast<uint32_t>(texts->size());
