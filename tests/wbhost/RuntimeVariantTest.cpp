@@ -90,6 +90,33 @@ TEST(RuntimeVariant, OneNameOneAttributeOfAnyKind) {
     WbVariantDestroy(element);
 }
 
+TEST(RuntimeVariant, ElementsOfAZeroFilledHostArrayAreVariantsOnFirstUse) {
+    const size_t live = wbhost::runtime::VariantTable::Instance().LiveCount();
+    // A name list as modules prepare it: a count, padding, then one variant slot per element.
+    WBHandle list = DSNewHClr(8 + 8 * 2);
+    ASSERT_NE(list, nullptr);
+    auto slot = [&](int i) {
+        return reinterpret_cast<WBVariant>(static_cast<char*>(*list) + 8 + 8 * i);
+    };
+    EXPECT_EQ(GetText(slot(0), "n", kWBArgErr), "<none>"); // reading does not create
+    ASSERT_EQ(SetText(slot(0), "n", "DIO0"), kWBNoErr);
+    ASSERT_EQ(WbVariantPStrSetUI32Attr(slot(1), Name("f").get(), 1), kWBNoErr);
+    EXPECT_EQ(GetText(slot(0), "n"), "DIO0");
+    WBVariant held = nullptr;
+    std::memcpy(&held, slot(0), sizeof held);
+    EXPECT_EQ(GetText(held, "n"), "DIO0");
+    // A slot past the block, or straddling its end, is not a variant.
+    EXPECT_EQ(SetText(reinterpret_cast<WBVariant>(static_cast<char*>(*list) + 20), "n", "x"),
+              kWBArgErr);
+    EXPECT_EQ(WbVariantDestroy(slot(0)), kWBNoErr);
+    EXPECT_EQ(WbVariantDestroy(slot(1)), kWBNoErr);
+    std::memcpy(&held, slot(0), sizeof held);
+    EXPECT_EQ(held, nullptr);
+    EXPECT_EQ(WbVariantDestroy(slot(0)), kWBArgErr);
+    DSDisposeHandle(list);
+    EXPECT_EQ(wbhost::runtime::VariantTable::Instance().LiveCount(), live);
+}
+
 TEST(RuntimeVariant, BadArgumentsGetHostErrors) {
     WBVariant variant = WbVariantCreate();
     const Name name("n");

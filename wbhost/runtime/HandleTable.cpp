@@ -3,6 +3,7 @@
 #include "runtime/HandleTable.h"
 
 #include <algorithm>
+#include <cstdint>
 #include <cstring>
 #include <new>
 
@@ -94,6 +95,18 @@ size_t HandleTable::SizeOf(WBHandle handle) const {
 bool HandleTable::IsLive(WBHandle handle) const {
     const std::lock_guard guard(lock_);
     return blocks_.count(handle) != 0;
+}
+
+bool HandleTable::Contains(const void* address, size_t size) const {
+    const auto start = reinterpret_cast<uintptr_t>(address);
+    const std::lock_guard guard(lock_);
+    for (const auto& [handle, block] : blocks_) {
+        const auto data = reinterpret_cast<uintptr_t>(block->data);
+        if (start >= data && block->size >= size && start - data <= block->size - size) {
+            return true;
+        }
+    }
+    return false;
 }
 
 size_t HandleTable::LiveCount() const {

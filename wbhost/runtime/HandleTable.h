@@ -32,6 +32,8 @@ public:
     size_t SizeOf(WBHandle handle) const;
     // Whether `handle` is a live block of this table.
     bool IsLive(WBHandle handle) const;
+    // Whether the SIZE bytes at ADDRESS lie inside the data of one live block.
+    bool Contains(const void* address, size_t size) const;
     // The number of live blocks (to find blocks that were never released).
     size_t LiveCount() const;
 
