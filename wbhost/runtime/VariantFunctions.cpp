@@ -44,7 +44,7 @@ WBVariant Resolve(WBVariant variant, bool create) {
         return nullptr;
     }
     WBVariant held = nullptr;
-    std::memcpy(&held, variant, sizeof held);
+    std::memcpy(&held, static_cast<const void*>(variant), sizeof held);
     if (held == nullptr && create) {
         held = variants.Create();
         std::memcpy(static_cast<void*>(variant), &held, sizeof held);
