@@ -3,6 +3,7 @@
 #include "framework/com/Bstr.h"
 #include "framework/com/TaskMem.h"
 #include "runner/HostProgram.h"
+#include "runner/ProgramFile.h"
 #include "runner/RunnerService.h"
 #include "runtime/Runtime.h"
 
@@ -140,6 +141,16 @@ TEST_F(RunnerProgram, AnswerTextsOfTheWrongFormSetNothing) {
     EXPECT_TRUE(session->AnswersFor("wizard").empty());
     EXPECT_TRUE(session->SetAnswerFromText("wizard:2=text:a=b:c"));
     EXPECT_EQ(session->AnswersFor("wizard").at(2), ProgramValue(std::u16string(u"a=b:c")));
+}
+
+TEST(RunnerProgramFile, KeysAreTrimmedAndCommentsSkipped) {
+    const auto file = ParseProgramFile("\xEF\xBB\xBF# made elsewhere\r\n"
+                                       "  behaviour :  unique-name \r\n\r\ntitle: a: b\n");
+    ASSERT_TRUE(file);
+    EXPECT_EQ(file->behaviour, "unique-name");
+    EXPECT_EQ(file->keys.at("title"), "a: b");
+    EXPECT_FALSE(ParseProgramFile("behaviour:\n"));
+    EXPECT_FALSE(ParseProgramFile(": unique-name\nbehaviour: unique-name\n"));
 }
 
 TEST_F(RunnerProgram, MissingAndMalformedProgramsDoNotOpen) {

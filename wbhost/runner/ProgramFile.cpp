@@ -26,6 +26,10 @@ std::string_view Trim(std::string_view text) {
 
 std::optional<ProgramFile> ParseProgramFile(std::string_view text) {
     ProgramFile file;
+    // Editors on other systems may start a UTF-8 text with a byte-order mark.
+    if (text.starts_with("\xEF\xBB\xBF")) {
+        text.remove_prefix(3);
+    }
     while (!text.empty()) {
         const size_t end = text.find('\n');
         const std::string_view line = Trim(text.substr(0, end));
