@@ -1,6 +1,7 @@
 // UTF-8 <-> UTF-16 conversion with the module's own rules (three-byte maximum).
 #include "kern/Utf8.h"
 
+#include "kern/AsciiRun.h"
 #include "kern/exception/Exception.h"
 
 #include <cstdint>
@@ -41,22 +42,6 @@ size_t DecodeOne(std::string_view s, size_t i, char16_t& unit) {
     QV_THROW(exception::InvalidSequence());
 }
 
-// The length of the run of ASCII bytes at s[i], looked at eight bytes at a time: names and XML
-// text are mostly ASCII, and such runs need no decoding.
-size_t AsciiRun(std::string_view s, size_t i) {
-    const size_t start = i;
-    while (i + 8 <= s.size()) {
-        uint64_t word = 0;
-        std::memcpy(&word, s.data() + i, 8);
-        if ((word & 0x8080808080808080ull) != 0)
-            break;
-        i += 8;
-    }
-    while (i < s.size() && static_cast<unsigned char>(s[i]) < 0x80u)
-        ++i;
-    return i - start;
-}
-
 } // namespace
 
 std::u16string Utf8ToWide(std::string_view utf8) {
@@ -64,7 +49,7 @@ std::u16string Utf8ToWide(std::string_view utf8) {
     size_t units = 0;
     char16_t unit = 0;
     for (size_t i = 0; i < utf8.size();) {
-        const size_t run = AsciiRun(utf8, i);
+        const size_t run = AsciiPrefixLength(utf8.substr(i));
         units += run;
         i += run;
         if (i < utf8.size()) {
@@ -75,7 +60,7 @@ std::u16string Utf8ToWide(std::string_view utf8) {
     std::u16string out(units, u'\0');
     char16_t* o = out.data();
     for (size_t i = 0; i < utf8.size();) {
-        const size_t run = AsciiRun(utf8, i);
+        const size_t run = AsciiPrefixLength(utf8.substr(i));
         for (size_t k = 0; k < run; ++k)
             o[k] = static_cast<unsigned char>(utf8[i + k]);
         o += run;

@@ -1,6 +1,8 @@
 // The adapter between Expat and wide-string event handlers.
 #include "resource_tree/ExPatHandler.h"
 
+#include "kern/AsciiRun.h"
+
 #include <cstring>
 #include <new>
 #include <unicode/ustring.h>
@@ -10,9 +12,7 @@ namespace wbhw {
 void AppendUtf8AsUtf16(std::string_view utf8, std::u16string& out) {
     // Markup is nearly all ASCII; widen that directly and leave the rest to ICU, which also turns
     // four-byte sequences into surrogate pairs.
-    size_t ascii = 0;
-    while (ascii < utf8.size() && static_cast<unsigned char>(utf8[ascii]) < 0x80u)
-        ++ascii;
+    const size_t ascii = qv::kern::AsciiPrefixLength(utf8);
     const size_t base = out.size();
     out.resize(base + utf8.size());
     for (size_t i = 0; i < ascii; ++i)

@@ -2,6 +2,7 @@
 // platform paths and the UTF-8 form handed to Expat.
 #include "resource_tree/LoaderText.h"
 
+#include "kern/AsciiRun.h"
 #include "resource_tree/ExPatHandler.h"
 #include "resource_tree/ListText.h"
 
@@ -250,13 +251,13 @@ std::string JoinFilePath(const std::string& base, const std::string& relative) {
 
 std::string ToUtf8(std::u16string_view text) {
     // Markup is nearly all ASCII: that part is narrowed in one pass into a buffer of its size.
-    size_t ascii = 0;
-    while (ascii < text.size() && text[ascii] < 0x80)
-        ++ascii;
+    const size_t ascii = qv::kern::AsciiPrefixLength(text);
     std::string out;
     out.reserve(text.size() + (text.size() - ascii) / 2);
+    // One sized write, not a push_back per character: this loop runs over whole documents.
+    out.resize(ascii);
     for (size_t i = 0; i < ascii; ++i)
-        out.push_back(static_cast<char>(text[i]));
+        out[i] = static_cast<char>(text[i]);
     if (ascii == text.size())
         return out;
     for (size_t i = ascii; i < text.size(); ++i) {
