@@ -81,8 +81,7 @@ typedef WBErr TargetItemFromAppRefFn(WBRefNum appRef, void** item);
 // The COM interface `iid` (a pointer to a 16-byte GUID) of the object behind the reference number
 // at `refnum` (host programs hand refnums by reference, and the pointer is passed on as it came);
 // answers a COM-style status.
-typedef int32_t QueryInterfaceForWBRefNumFn(const WBRefNum* refnum, const void* iid,
-                                            void** object);
+typedef int32_t QueryInterfaceForWBRefNumFn(const WBRefNum* refnum, const void* iid, void** object);
 
 // Variants. Attribute names are Pascal strings (a length byte, then the bytes).
 typedef WBErr WbVariantPStrGetStringAttrFn(WBVariant variant, const unsigned char* name,
