@@ -35,15 +35,6 @@ uint64_t ParseDecimal(std::u16string_view digits) noexcept {
     return value;
 }
 
-std::u16string Decimal(uint64_t value) {
-    std::u16string text;
-    do {
-        text.insert(text.begin(), static_cast<char16_t>(u'0' + value % 10));
-        value /= 10;
-    } while (value != 0);
-    return text;
-}
-
 // A piece prefix[var=first..last]suffix, split into its parts.
 struct Range {
     std::u16string_view prefix, variable, suffix;
@@ -159,7 +150,7 @@ std::vector<ExpandedName> ExpandNames(std::u16string_view value, size_t limit, b
                 return names;
             }
             std::u16string name(range.prefix);
-            name += Decimal(i);
+            name += DecimalText(i);
             name += range.suffix;
             names.push_back({std::move(name), std::u16string(range.variable), i});
             if (i == UINT64_MAX)
@@ -247,6 +238,15 @@ std::string JoinFilePath(const std::string& base, const std::string& relative) {
     if (relative.empty())
         return base;
     return base.back() == '/' ? base + relative : base + "/" + relative;
+}
+
+std::u16string DecimalText(uint64_t value) {
+    std::u16string text;
+    do {
+        text.insert(text.begin(), static_cast<char16_t>(u'0' + value % 10));
+        value /= 10;
+    } while (value != 0);
+    return text;
 }
 
 std::string ToUtf8(std::u16string_view text) {

@@ -44,6 +44,9 @@ std::u16string PlatformPathText(std::u16string_view text);
 // BASE and RELATIVE joined with the platform separator; RELATIVE alone when it is absolute.
 std::string JoinFilePath(const std::string& base, const std::string& relative);
 
+// The decimal text of VALUE.
+std::u16string DecimalText(uint64_t value);
+
 // Standard UTF-8 for a UTF-16 text (pairs become four bytes; a lone surrogate is written as its
 // three-byte form, which a strict reader rejects).
 std::string ToUtf8(std::u16string_view text);

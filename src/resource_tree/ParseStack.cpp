@@ -25,15 +25,6 @@ bool IsAncestorOrSelf(const ResTreeNode* ancestor, const ResTreeNode* node) noex
     return false;
 }
 
-std::u16string DecimalText(uint64_t value) {
-    std::u16string text;
-    do {
-        text.insert(text.begin(), static_cast<char16_t>(u'0' + value % 10));
-        value /= 10;
-    } while (value != 0);
-    return text;
-}
-
 ParseStack::ParseStack(ResTreeNode& node, bool asChild, LoadContext& context,
                        std::u16string filePath)
     : context_(context), filePath_(std::move(filePath)) {

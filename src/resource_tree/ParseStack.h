@@ -109,7 +109,4 @@ private:
 // True when ANCESTOR is NODE or one of NODE's ancestors.
 bool IsAncestorOrSelf(const ResTreeNode* ancestor, const ResTreeNode* node) noexcept;
 
-// The decimal text of VALUE.
-std::u16string DecimalText(uint64_t value);
-
 } // namespace wbhw
