@@ -148,15 +148,7 @@ ResTreeNode::Position ResTreeNode::InsertEntry(Position position, WString&& name
 
 ResTreeNode::AddResult ResTreeNode::AddText(Position position, WString name, WString text,
                                             EntryKind kind) {
-    if (!IsTextKind(kind))
-        kind = EntryKind::Text;
-    bool inserted = false;
-    const Position at = InsertEntry(position, std::move(name), kind, inserted);
-    if (inserted) {
-        at->text_ = std::move(text);
-        RaiseChanges(kValueAdded);
-    }
-    return {at, inserted};
+    return AddOrSetText(position, std::move(name), std::move(text), kind, false);
 }
 
 ResTreeNode::AddResult ResTreeNode::AddLink(Position position, WString name, WString path) {

@@ -11,13 +11,6 @@ namespace wbhw {
 namespace {
 using namespace test;
 
-std::vector<std::u16string> Names(const ResTreeNode& node) {
-    std::vector<std::u16string> names;
-    for (ResTreePosition at = node.Begin(); at != node.End(); ++at)
-        names.push_back(at->Name());
-    return names;
-}
-
 TEST(ResTreeNode, UnorderedNodesKeepOneEntryPerNameRegardlessOfCase) {
     ResTreeNode node(u"n", u"IOResource", false);
     EXPECT_TRUE(node.AddText(node.End(), u"Pin", u"1").inserted);

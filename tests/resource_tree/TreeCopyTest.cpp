@@ -8,13 +8,6 @@ namespace wbhw {
 namespace {
 using namespace test;
 
-std::vector<std::u16string> Names(const ResTreeNode& node) {
-    std::vector<std::u16string> names;
-    for (ResTreePosition at = node.Begin(); at != node.End(); ++at)
-        names.push_back(at->Name());
-    return names;
-}
-
 bool HasError(ResTreeNode& node, std::u16string_view part) {
     return TextOf(node, u"XMLParseErrors").find(part) != std::u16string::npos;
 }

@@ -8,6 +8,7 @@
 #include <fstream>
 #include <memory>
 #include <string>
+#include <vector>
 
 namespace wbhw::test {
 
@@ -25,6 +26,14 @@ inline std::unique_ptr<ResTreeNode> Load(std::u16string_view text,
     if (result != nullptr)
         *result = status;
     return root;
+}
+
+// The names of NODE's entries in container order.
+inline std::vector<std::u16string> Names(const ResTreeNode& node) {
+    std::vector<std::u16string> names;
+    for (ResTreePosition at = node.Begin(); at != node.End(); ++at)
+        names.push_back(at->Name());
+    return names;
 }
 
 // The text of entry NAME in NODE, or "<absent>".

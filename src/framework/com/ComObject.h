@@ -41,6 +41,20 @@ template <class Obj, class... Args> Obj* NewObject(HRESULT& hr, Args&&... args) 
     }
     return nullptr;
 }
+
+// Answers a query of OBJECT from T's interface list: the interface with a reference added
+// through OBJECT's own AddRef, E_POINTER for a null slot, E_NOINTERFACE when T lacks it.
+template <class T, class Obj> HRESULT AnswerQuery(Obj* object, const IID& iid, void** out) {
+    if (!out) {
+        return E_POINTER;
+    }
+    *out = FindInterface<T>(object, iid);
+    if (!*out) {
+        return E_NOINTERFACE;
+    }
+    object->AddRef();
+    return S_OK;
+}
 } // namespace detail
 
 // T with an atomic reference count and a QueryInterface generated from T::Interfaces. T itself
@@ -79,15 +93,7 @@ public:
 
     // Answers T's interfaces (its list, then QueryOtherInterface) with a reference.
     HRESULT QueryInterface(const IID& iid, void** object) {
-        if (!object) {
-            return E_POINTER;
-        }
-        *object = FindInterface<T>(this, iid);
-        if (!*object) {
-            return E_NOINTERFACE;
-        }
-        AddRef();
-        return S_OK;
+        return detail::AnswerQuery<T>(this, iid, object);
     }
     // Adds a reference; answers the new count.
     uint32_t AddRef() { return refs_.fetch_add(1, std::memory_order_relaxed) + 1; }
@@ -136,15 +142,7 @@ public:
     // The query the outer object forwards here: T's own interfaces, referenced through the
     // outer object.
     HRESULT InnerQueryInterface(const IID& iid, void** object) {
-        if (!object) {
-            return E_POINTER;
-        }
-        *object = FindInterface<T>(this, iid);
-        if (!*object) {
-            return E_NOINTERFACE;
-        }
-        AddRef();
-        return S_OK;
+        return detail::AnswerQuery<T>(this, iid, object);
     }
     // The object that owns this one.
     IUnknown* Outer() const { return outer_; }
