@@ -8,7 +8,6 @@
 #include <sstream>
 #include <sys/stat.h>
 #include <unistd.h>
-#include <vector>
 
 namespace wbhost::project {
 
@@ -63,17 +62,23 @@ std::string FolderOf(const std::string& path) {
 
 } // namespace
 
+std::string TemporaryFileFor(const std::string& path) {
+    return path + ".tmp";
+}
+
 bool WriteFileAtomically(const std::string& path, std::string_view content, std::string* error,
                          const std::function<bool()>& beforeRename) {
-    // Same folder, so the rename never crosses file systems and stays atomic.
-    std::string pattern = path + ".tmp-XXXXXX";
-    std::vector<char> name(pattern.begin(), pattern.end());
-    name.push_back('\0');
-    FileDescriptor file(::mkstemp(name.data()));
+    // Same folder, so the rename never crosses file systems and stays atomic. The name is fixed,
+    // so a file left by a save that was killed half-way is replaced by the next one instead of
+    // piling up; it is made afresh (O_EXCL, never through a link someone planted there).
+    const std::string temporary = TemporaryFileFor(path);
+    if (::unlink(temporary.c_str()) != 0 && errno != ENOENT)
+        return Fail(error, "cannot remove the unfinished save", temporary);
+    FileDescriptor file(
+        ::open(temporary.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_NOFOLLOW | O_CLOEXEC, 0600));
     if (file.Get() < 0)
         return Fail(error, "cannot create a temporary file beside", path);
-    const std::string temporary(name.data());
-    // mkstemp makes the file private; give it the old file's mode, or the usual one.
+    // The file starts private; give it the old file's mode, or the usual one.
     struct stat old {};
     if (::stat(path.c_str(), &old) == 0) {
         ::fchmod(file.Get(), old.st_mode & 07777);

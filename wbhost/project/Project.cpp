@@ -7,6 +7,7 @@
 #include "project/ItemUIMap.h"
 
 #include <algorithm>
+#include <cstdio>
 #include <functional>
 
 namespace wbhost::project {
@@ -17,6 +18,12 @@ namespace {
 void SetError(std::string* error, std::string message) {
     if (error != nullptr)
         *error = std::move(message);
+}
+
+std::string HexStatus(HRESULT hr) {
+    char text[16];
+    std::snprintf(text, sizeof text, "0x%08X", static_cast<unsigned>(hr));
+    return text;
 }
 } // namespace
 
@@ -33,6 +40,7 @@ Project::Project(resources::ResourceService& service, std::u16string name) : ser
 }
 
 Project::~Project() {
+    DetachProviders();
     for (const auto& target : targets_)
         if (TargetObject* object = TargetOf(*target.Get()))
             object->Clear();
@@ -129,9 +137,42 @@ SavedProject Project::Snapshot() const {
     return saved;
 }
 
+HRESULT Project::AttachProvider(ComPtr<IwbProjectProvider> provider, bool reloaded) {
+    if (!provider)
+        return E_POINTER;
+    IUnknown* const project = &Root();
+    const HRESULT hr = reloaded ? provider->AttachReloaded(project) : provider->Attach(project);
+    if (FAILED(hr))
+        return hr;
+    providers_.push_back(std::move(provider));
+    return S_OK;
+}
+
+void Project::DetachProviders() {
+    // Taken out first: a provider that detaches may reach the project again.
+    auto providers = std::move(providers_);
+    providers_.clear();
+    for (auto each = providers.rbegin(); each != providers.rend(); ++each)
+        (*each)->Detach();
+}
+
 bool Project::Save(const std::string& path, std::string* error,
                    const std::function<bool()>& beforeRename) const {
-    return WriteFileAtomically(path, FormatProject(Snapshot()), error, beforeRename);
+    // Providers write their items' last state into the properties now, so the snapshot is taken
+    // only after every one of them agreed.
+    for (const auto& provider : providers_) {
+        if (const HRESULT hr = provider->ProjectSaving(); FAILED(hr)) {
+            SetError(error, "a provider refused to save the project to \"" + path + "\" (status " +
+                                HexStatus(hr) + ")");
+            return false;
+        }
+    }
+    if (!WriteFileAtomically(path, FormatProject(Snapshot()), error, beforeRename))
+        return false;
+    // The file is in place whatever a provider answers now.
+    for (const auto& provider : providers_)
+        provider->ProjectSaved();
+    return true;
 }
 
 std::unique_ptr<Project> Project::Open(const std::string& path, resources::ResourceService& service,

@@ -4,6 +4,7 @@
 
 #include "framework/com/ComPtr.h"
 #include "host/contracts/IwbProjectItemUIMap.h"
+#include "host/contracts/IwbProjectProvider.h"
 #include "project/ProjectFormat.h"
 #include "project/ProjectItem.h"
 #include "project/TargetObject.h"
@@ -31,7 +32,8 @@ public:
 
     // An empty project called NAME whose targets load through SERVICE (which must outlive it).
     explicit Project(resources::ResourceService& service, std::u16string name = u"Project");
-    // Closes every item, so references held elsewhere reach detached items.
+    // Detaches the providers, then closes every item, so references held elsewhere reach
+    // detached items.
     ~Project();
     Project(const Project&) = delete;
     Project& operator=(const Project&) = delete;
@@ -58,10 +60,19 @@ public:
     // The item with identifier ID, or null.
     ProjectItem* FindById(const GUID& id);
 
+    // Attaches PROVIDER to this project (through Attach, or AttachReloaded for a project that was
+    // opened from its file, with the root item as the project object) and keeps it, to be told of
+    // saves, until DetachProviders. Its failure is answered and it is not kept; null: E_POINTER.
+    HRESULT AttachProvider(qv::com::ComPtr<IwbProjectProvider> provider, bool reloaded);
+    // Detaches every attached provider, the last attached first. Nothing when none is.
+    void DetachProviders();
+
     // Everything the project file keeps, parents before children.
     SavedProject Snapshot() const;
-    // Writes the project to PATH atomically (see WriteFileAtomically); false with a message in
-    // ERROR (may be null) when it could not. BEFORERENAME as there.
+    // Writes the project to PATH atomically (see WriteFileAtomically): every attached provider
+    // hears ProjectSaving first (a failure stops the save before anything is written and says
+    // which status) and, once the file is in place, ProjectSaved. False with a message in ERROR
+    // (may be null) when it could not. BEFORERENAME as there.
     bool Save(const std::string& path, std::string* error,
               const std::function<bool()>& beforeRename = {}) const;
     // Reads the project file PATH into a new project whose targets load through SERVICE and
@@ -80,6 +91,7 @@ private:
     qv::com::ComPtr<ProjectItem> root_;
     qv::com::ComPtr<IwbProjectItemUIMap> uiMap_;
     std::vector<qv::com::ComPtr<ProjectItem>> targets_;
+    std::vector<qv::com::ComPtr<IwbProjectProvider>> providers_;
     ObjectFactory factory_;
 };
 
