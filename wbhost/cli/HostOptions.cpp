@@ -1,0 +1,53 @@
+// What every project command shares.
+#include "cli/HostOptions.h"
+
+#include "cli/Answers.h"
+#include "cli/HostText.h"
+#include "kern/Collate.h"
+
+#include <filesystem>
+#include <ostream>
+
+namespace wbhost::cli {
+
+bool StartSession(const HostOptions& options, session::HostSession& session, std::ostream& err) {
+    std::string error;
+    if (!session.Open(options.modulePath, &error)) {
+        err << "wbhost: " << error << "\n";
+        return false;
+    }
+    if (!ApplyAnswers(options.answerFiles, options.answers, session.Programs(), error)) {
+        err << "wbhost: " << error << "\n";
+        return false;
+    }
+    return true;
+}
+
+void FinishSession(const HostOptions& options, session::HostSession& session, std::ostream& out) {
+    if (!options.record)
+        return;
+    out << "-- program runs\n";
+    PrintRuns(session.Programs(), out);
+}
+
+project::ProjectItem* FindTarget(project::Project& project, std::string_view name,
+                                 std::ostream& err) {
+    const std::u16string wanted = FromUtf8(name);
+    std::string known;
+    for (const auto& target : project.Targets()) {
+        if (qv::kern::EqualsNoCase(target->Name(), wanted))
+            return target.Get();
+        known += (known.empty() ? " " : ", ") + ("\"" + ToUtf8(target->Name()) + "\"");
+    }
+    err << "wbhost: the project has no target called \"" << name
+        << "\" (targets:" << (known.empty() ? " none" : known) << ")\n";
+    return nullptr;
+}
+
+std::string AbsolutePath(const std::string& path) {
+    std::error_code failed;
+    const auto absolute = std::filesystem::absolute(path, failed);
+    return failed ? path : absolute.lexically_normal().string();
+}
+
+} // namespace wbhost::cli

@@ -1,0 +1,237 @@
+// The work behind `wbhost project new|list|add-item`.
+#include "cli/ProjectCommands.h"
+
+#include "cli/AttributeSet.h"
+#include "cli/HostText.h"
+#include "cli/ItemListing.h"
+#include "kern/Collate.h"
+#include "provider/TIOIdentifiers.h"
+
+#include <filesystem>
+#include <iomanip>
+#include <ostream>
+#include <set>
+#include <sstream>
+
+namespace wbhost::cli {
+namespace {
+
+using project::ProjectItem;
+
+std::string Hex(HRESULT status) {
+    std::ostringstream text;
+    text << "0x" << std::hex << std::setw(8) << std::setfill('0') << static_cast<uint32_t>(status);
+    return text.str();
+}
+
+// The child of PARENT called NAME (without regard to case), or null.
+ProjectItem* ChildNamed(const ProjectItem& parent, std::u16string_view name) {
+    for (const auto& child : parent.Children()) {
+        if (qv::kern::EqualsNoCase(child->Name(), name))
+            return child.Get();
+    }
+    return nullptr;
+}
+
+// NAME split at "/" into folder names and the item's name; empty when a part is empty.
+std::vector<std::u16string> SplitPlace(std::u16string_view name) {
+    std::vector<std::u16string> parts;
+    while (true) {
+        const size_t slash = name.find(u'/');
+        parts.emplace_back(name.substr(0, slash));
+        if (parts.back().empty())
+            return {};
+        if (slash == std::u16string_view::npos)
+            return parts;
+        name.remove_prefix(slash + 1);
+    }
+}
+
+// The folder FOLDERNAME below PARENT, made when absent; null, with the reason on ERR, when an
+// item of another type holds the name or the folder cannot be made.
+ProjectItem* FolderIn(ProjectItem& parent, const std::u16string& folderName, std::ostream& err) {
+    if (ProjectItem* existing = ChildNamed(parent, folderName)) {
+        if (IsEqualGUID(existing->Type(), wbproj::kFolderType))
+            return existing;
+        err << "wbhost: \"" << ToUtf8(folderName) << "\" below \"" << ToUtf8(parent.Name())
+            << "\" is a " << ItemTypeName(existing->Type()) << ", not a folder\n";
+        return nullptr;
+    }
+    if (const HRESULT made = parent.CreateChild(wbproj::kFolderType, folderName.c_str(), nullptr);
+        FAILED(made)) {
+        err << "wbhost: cannot make the folder \"" << ToUtf8(folderName) << "\" (status "
+            << Hex(made) << ")\n";
+        return nullptr;
+    }
+    return ChildNamed(parent, folderName);
+}
+
+// The Tangent I/O item called NAME anywhere below SCOPE, or null.
+const ProjectItem* IOItemNamed(const ProjectItem& scope, std::u16string_view name) {
+    for (const auto& child : scope.Children()) {
+        if (IsEqualGUID(child->Type(), tio::kIOItemType) &&
+            qv::kern::EqualsNoCase(child->Name(), name))
+            return child.Get();
+        if (const ProjectItem* below = IOItemNamed(*child.Get(), name))
+            return below;
+    }
+    return nullptr;
+}
+
+// Makes the Tangent I/O item NAME below PARENT through the provider; null with the reason on ERR.
+// I/O item names are unique in their whole target (TARGET), folders or not.
+ProjectItem* NewIOItem(ProjectItem& target, ProjectItem& parent, const std::u16string& name,
+                       std::ostream& err) {
+    if (ProjectItem* existing = ChildNamed(parent, name)) {
+        err << "wbhost: \"" << ToUtf8(parent.Name()) << "\" already has an item called \""
+            << ToUtf8(existing->Name()) << "\"\n";
+        return nullptr;
+    }
+    if (const ProjectItem* existing = IOItemNamed(target, name)) {
+        err << "wbhost: target \"" << ToUtf8(target.Name())
+            << "\" already has an I/O item called \"" << ToUtf8(existing->Name()) << "\"\n";
+        return nullptr;
+    }
+    if (const HRESULT made = parent.CreateChild(tio::kIOItemType, name.c_str(), nullptr);
+        FAILED(made)) {
+        err << "wbhost: the module's provider cannot make a Tangent I/O item now (status "
+            << Hex(made) << ")\n";
+        return nullptr;
+    }
+    ProjectItem* item = ChildNamed(parent, name);
+    if (item != nullptr && item->Object() == nullptr) {
+        // A module that does not know the type leaves a bare item behind: not worth keeping.
+        parent.RemoveChild(item);
+        err << "wbhost: the loaded module's provider does not make Tangent I/O items\n";
+        return nullptr;
+    }
+    return item;
+}
+
+bool ResourceExists(project::Project& project, ProjectItem& target, std::u16string_view path) {
+    project::TargetObject* object = project.TargetOf(target);
+    if (object == nullptr)
+        return false;
+    resources::ResourceTree& tree = *object->Target().tree;
+    const std::lock_guard hold(tree.Mutex());
+    return tree.Find(path) != nullptr;
+}
+
+bool SaveProject(session::HostSession& session, const std::string& path, std::ostream& err) {
+    std::string error;
+    if (session.Save(path, &error))
+        return true;
+    err << "wbhost: " << error << "\n";
+    return false;
+}
+
+} // namespace
+
+int RunProjectNew(const HostOptions& options, const std::string& projectPath,
+                  const std::vector<std::string>& targets, bool replace, std::ostream& out,
+                  std::ostream& err) {
+    if (!replace && std::filesystem::exists(projectPath)) {
+        err << "wbhost: " << projectPath << " exists already (--force replaces it)\n";
+        return kProjectFailed;
+    }
+    session::HostSession session;
+    std::string error;
+    if (!StartSession(options, session, err))
+        return kProjectFailed;
+    const std::u16string projectName = FromUtf8(std::filesystem::path(projectPath).stem().string());
+    if (!session.NewProject(projectName, &error)) {
+        err << "wbhost: " << error << "\n";
+        return kProjectFailed;
+    }
+    project::Project& project = *session.Project();
+    std::set<std::u16string> seen;
+    for (const std::string& text : targets) {
+        const size_t equals = text.find('=');
+        if (equals == std::string::npos || equals == 0 || equals + 1 == text.size()) {
+            err << "wbhost: target \"" << text << "\" is not of the form NAME=DESCRIPTION.xml\n";
+            return kProjectFailed;
+        }
+        const std::u16string name = FromUtf8(text.substr(0, equals));
+        if (ChildNamed(project.Root(), name) != nullptr) {
+            err << "wbhost: two targets are called \"" << text.substr(0, equals) << "\"\n";
+            return kProjectFailed;
+        }
+        const auto target = project.AddTarget(name, AbsolutePath(text.substr(equals + 1)), &error);
+        if (!target) {
+            err << "wbhost: " << error << "\n";
+            return kProjectFailed;
+        }
+        for (const auto& problem : project.TargetOf(*target.Get())->Target().problems)
+            err << "warning: " << text.substr(equals + 1) << ": " << ToUtf8(problem.path) << ": "
+                << ToUtf8(problem.message) << "\n";
+    }
+    if (!SaveProject(session, projectPath, err))
+        return kProjectFailed;
+    out << "created " << projectPath << "\n";
+    PrintItemTree(project.Root(), out);
+    FinishSession(options, session, out);
+    return kProjectOk;
+}
+
+int RunProjectList(const HostOptions& options, const std::string& projectPath, std::ostream& out,
+                   std::ostream& err) {
+    session::HostSession session;
+    std::string error;
+    if (!StartSession(options, session, err))
+        return kProjectFailed;
+    if (!session.OpenProject(projectPath, &error)) {
+        err << "wbhost: " << error << "\n";
+        return kProjectFailed;
+    }
+    PrintItemTree(session.Project()->Root(), out);
+    FinishSession(options, session, out);
+    return kProjectOk;
+}
+
+int RunAddItem(const HostOptions& options, const std::string& projectPath,
+               const AddItemRequest& request, std::ostream& out, std::ostream& err) {
+    session::HostSession session;
+    std::string error;
+    if (!StartSession(options, session, err))
+        return kProjectFailed;
+    if (!session.OpenProject(projectPath, &error)) {
+        err << "wbhost: " << error << "\n";
+        return kProjectFailed;
+    }
+    project::Project& project = *session.Project();
+    ProjectItem* target = FindTarget(project, request.target, err);
+    if (target == nullptr)
+        return kProjectFailed;
+    const std::u16string resource = FromUtf8(request.resource);
+    if (resource.empty() || !ResourceExists(project, *target, resource)) {
+        err << "wbhost: target \"" << request.target << "\" has no resource \"" << request.resource
+            << "\"\n";
+        return kProjectFailed;
+    }
+    const std::u16string place = request.name.empty()
+                                     ? resource.substr(resource.find_last_of(u'/') + 1)
+                                     : FromUtf8(request.name);
+    const std::vector<std::u16string> parts = SplitPlace(place);
+    if (parts.empty()) {
+        err << "wbhost: \"" << ToUtf8(place) << "\" is no item name (empty name or folder)\n";
+        return kProjectFailed;
+    }
+    ProjectItem* parent = target;
+    for (size_t i = 0; i + 1 < parts.size() && parent != nullptr; ++i)
+        parent = FolderIn(*parent, parts[i], err);
+    ProjectItem* item =
+        parent == nullptr ? nullptr : NewIOItem(*target, *parent, parts.back(), err);
+    if (item == nullptr)
+        return kProjectFailed;
+    // The attribute set the item keeps and binds from, as the new-item wizard would hand it.
+    item->Bag().SetString(u"tioAttrBag", NewItemAttributeSet(place, resource).c_str(), 0);
+    if (!SaveProject(session, projectPath, err))
+        return kProjectFailed;
+    out << "added \"" << ToUtf8(place) << "\" for " << request.resource << " to target \""
+        << ToUtf8(target->Name()) << "\"\n";
+    PrintItemTree(*target, out);
+    FinishSession(options, session, out);
+    return kProjectOk;
+}
+
+} // namespace wbhost::cli

@@ -1,0 +1,43 @@
+// The work behind `wbhost project new|list|add-item`: a project file made, shown and given
+// items through the loaded module's provider.
+#pragma once
+
+#include "cli/HostOptions.h"
+
+#include <iosfwd>
+#include <string>
+#include <vector>
+
+namespace wbhost::cli {
+
+// Exit codes of the project and edit commands.
+enum ProjectExit : int { kProjectOk = 0, kProjectFailed = 1 };
+
+// Creates the project file PROJECTPATH with one target per "NAME=DESCRIPTION" text of TARGETS
+// (descriptions kept by absolute path) and writes its item tree to OUT. Refuses, touching
+// nothing, when the file exists and REPLACE is false, when a target text is malformed or a
+// name repeats, when a description does not load, or when the save fails; loader problems of a
+// description that loads are shown on ERR as warnings.
+int RunProjectNew(const HostOptions& options, const std::string& projectPath,
+                  const std::vector<std::string>& targets, bool replace, std::ostream& out,
+                  std::ostream& err);
+
+// Opens PROJECTPATH and writes its item tree to OUT; kProjectFailed when it cannot be opened.
+int RunProjectList(const HostOptions& options, const std::string& projectPath, std::ostream& out,
+                   std::ostream& err);
+
+// What `project add-item` asks for.
+struct AddItemRequest {
+    std::string target;   // the target's name
+    std::string resource; // the resource's path in the target's tree
+    std::string name;     // the item's place and name ("Folder/Name"); empty: the resource's name
+};
+
+// Adds a Tangent I/O item for REQUEST to the project PROJECTPATH through the module's provider,
+// saves the project and writes the target's items to OUT. Fails, leaving the file as it was,
+// when the target or the resource does not exist, the name is empty or taken below its folder,
+// a path part names an item that is no folder, or the provider cannot make the item.
+int RunAddItem(const HostOptions& options, const std::string& projectPath,
+               const AddItemRequest& request, std::ostream& out, std::ostream& err);
+
+} // namespace wbhost::cli
