@@ -95,4 +95,41 @@ TEST(ProjectSave, FailuresAreReportedAndKeepTheFileMode) {
     EXPECT_EQ(info.st_mode & 0777, 0640u); // a save does not make the file private
 }
 
+TEST(ProjectSave, LeftoversOfEarlierSavesAreReplacedAndFailedSavesLeaveNone) {
+    ScratchFolder scratch;
+    wbhost::resources::ResourceService service;
+    Project project(service);
+    const std::string path = scratch.File("p.wbproj");
+    const std::string temporary = wbhost::project::TemporaryFileFor(path);
+    std::string error;
+    SetMark(project, u"first");
+    ASSERT_TRUE(project.Save(path, &error)) << error;
+
+    // A killed save left a longer, read-only file; it never shadows the project, and the next
+    // save writes a fresh one instead of appending to it or failing on it.
+    scratch.Write("p.wbproj.tmp", std::string(100000, 'x'));
+    ::chmod(temporary.c_str(), 0400);
+    EXPECT_EQ(MarkOf(path, service), u"first");
+    SetMark(project, u"second");
+    ASSERT_TRUE(project.Save(path, &error)) << error;
+    EXPECT_EQ(MarkOf(path, service), u"second");
+    EXPECT_EQ(FilesIn(scratch.Path()), std::vector<std::string>{"p.wbproj"});
+
+    // A link planted under the temporary name is removed, not written through.
+    const std::string victim = scratch.Write("victim", "keep");
+    ASSERT_EQ(::symlink(victim.c_str(), temporary.c_str()), 0);
+    ASSERT_TRUE(project.Save(path, &error)) << error;
+    std::string kept;
+    ASSERT_TRUE(wbhost::project::ReadWholeFile(victim, kept, nullptr));
+    EXPECT_EQ(kept, "keep");
+    EXPECT_FALSE(std::filesystem::is_symlink(path));
+
+    // The rename fails (a folder with contents is in the way): the temporary file goes too.
+    const std::string blocked = scratch.File("blocked");
+    std::filesystem::create_directories(blocked + "/inside");
+    EXPECT_FALSE(project.Save(blocked, &error));
+    EXPECT_NE(error.find("blocked"), std::string::npos) << error;
+    EXPECT_FALSE(std::filesystem::exists(wbhost::project::TemporaryFileFor(blocked)));
+}
+
 } // namespace

@@ -46,6 +46,9 @@ HostSession::HostSession()
     root_ = ComPtr<IUnknown>::Adopt(root ? root->GetUnknown() : nullptr);
     if (!runners_ || !root_)
         throw std::bad_alloc();
+    // Runners keep the finder they were made with; through the link, one made before a project
+    // was opened finds its items too, and one kept after it closed finds nothing.
+    runners_->SetItemFinder(FinderFor(link_));
 }
 
 HostSession::~HostSession() {
@@ -144,15 +147,13 @@ void HostSession::Close() {
 
 void HostSession::Wire() {
     link_->project = project_.get();
-    runners_->SetItemFinder(FinderFor(link_));
     runtime::SetTargetItemResolver(ResolverFor(link_));
     resolverOwner = this;
 }
 
 void HostSession::Unwire() {
-    // Runners made earlier keep the link, not the project: they answer "none" from now on.
+    // Runners hold the link, not the project: they answer "none" from now on.
     link_->project = nullptr;
-    runners_->SetItemFinder({});
     if (resolverOwner == this) {
         runtime::SetTargetItemResolver({});
         resolverOwner = nullptr;

@@ -54,6 +54,8 @@ public:
     project::Project* Project() noexcept { return project_.get(); }
     // The file the project came from or was last saved to; empty for a new, unsaved project.
     const std::string& ProjectPath() const noexcept { return projectPath_; }
+    // The loaded module, for its other exports; null before Open.
+    const cli::HostedModule* Module() const noexcept { return module_.get(); }
     // The module's provider; null before Open.
     IqxProvider* Provider() const noexcept { return provider_.Get(); }
     // The framework's root object the provider was initialised with (never null).
