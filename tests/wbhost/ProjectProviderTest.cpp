@@ -6,6 +6,8 @@
 #include "project/Project.h"
 #include "project/ProviderFactory.h"
 #include "provider/TIOIdentifiers.h"
+#include "runner/RunnerService.h"
+#include "session/RootObject.h"
 
 #include <gtest/gtest.h>
 
@@ -32,9 +34,16 @@ TEST(ProjectProvider, AttachesMakesItemsAndRemakesThemOnReopen) {
     wbhost::resources::ResourceService service;
     const std::string path = scratch.File("p.wbproj");
     std::string error;
+    // The provider starts with the framework's root object, as the session gives it.
+    wbhost::session::RootObject* root = nullptr;
+    ASSERT_EQ(wbhost::session::RootObject::CreateInstance(
+                  &root,
+                  ComPtr<IwbProgramRunnerService>::Share(wbhost::runner::NewRunnerService().Get())),
+              S_OK);
+    const auto rootObject = ComPtr<IUnknown>::Adopt(root->GetUnknown());
+    ASSERT_EQ(provider->Initialize(rootObject.Get()), S_OK);
     {
         Project project(service);
-        ASSERT_EQ(provider->Initialize(&project.Root()), S_OK);
         ASSERT_EQ(attachable->Attach(&project.Root()), S_OK);
         EXPECT_EQ(attachable->ProjectReady(), S_OK);
         project.SetObjectFactory(wbhost::project::ProviderFactory(provider));
