@@ -2,6 +2,7 @@
 #include "cli/Commands.h"
 #include "cli/Demo.h"
 #include "cli/EditCommands.h"
+#include "cli/ProgramCommand.h"
 #include "cli/ProjectCommands.h"
 
 #include <CLI/CLI.hpp>
@@ -64,7 +65,7 @@ void AddProject(CLI::App& app, Request& request) {
     create->add_option("PROJECT", *path, "the project file to create")->required();
     create->add_option("--target", *targets, "a target: its name and description file")
         ->type_name("NAME=DESCRIPTION.xml")
-        ->expected(1);
+        ->allow_extra_args(false);
     create->add_flag("--force", *force, "replace PROJECT when it exists");
     create->callback([&request, path, targets, force] {
         request.run = [&request, path, targets, force] {
@@ -129,6 +130,28 @@ void AddEdit(CLI::App& app, Request& request) {
     });
 }
 
+void AddProgram(CLI::App& app, Request& request) {
+    auto* program = app.add_subcommand(
+        "program", "run one host program as the module would, its dialogs answered from "
+                   "--answer/--answers, and print its outputs");
+    program->footer("A bare FILE name is looked up in the module's programs folder too, e.g.\n"
+                    "  wbhost program TIOGenUniqueName.gx --input 0=text:DIO "
+                    "--input \"1=list:DIO|DIO1\"");
+    auto file = std::make_shared<std::string>();
+    auto inputs = std::make_shared<std::vector<std::string>>();
+    program->add_option("FILE", *file, "the program file (.gx)")->required();
+    program
+        ->add_option("--input", *inputs,
+                     "an input: index=value, the value a number, "
+                     "text:... or list:a|b")
+        ->allow_extra_args(false);
+    program->callback([&request, file, inputs] {
+        request.run = [&request, file, inputs] {
+            return wbhost::cli::RunProgram(request.host, *file, *inputs, std::cout, std::cerr);
+        };
+    });
+}
+
 void AddDemo(CLI::App& app, Request& request) {
     auto* demo = app.add_subcommand(
         "demo", "play a whole session on the examples and print its transcript; exit 0 only "
@@ -158,15 +181,16 @@ int main(int argc, char** argv) {
         ->capture_default_str();
     app.add_option("--answers", request.host.answerFiles,
                    "a file of answers for the dialog programs, one behaviour:index=value a line")
-        ->expected(1);
+        ->allow_extra_args(false);
     app.add_option("--answer", request.host.answers,
                    "one answer for a dialog program: behaviour:index=value, the value a number, "
                    "text:... or list:a|b (overrides the files')")
-        ->expected(1);
+        ->allow_extra_args(false);
     app.add_flag("--record", request.host.record, "print the programs' runs at the end");
     AddTreeAndCompare(app, request);
     AddProject(app, request);
     AddEdit(app, request);
+    AddProgram(app, request);
     AddDemo(app, request);
 
     CLI11_PARSE(app, argc, argv);

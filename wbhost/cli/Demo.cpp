@@ -3,6 +3,7 @@
 
 #include "cli/Commands.h"
 #include "cli/EditCommands.h"
+#include "cli/ProgramCommand.h"
 #include "cli/ProjectCommands.h"
 
 #include <filesystem>
@@ -249,6 +250,33 @@ void PlayEdits(Transcript& script, const HostOptions& options, const WorkFolder&
                 });
 }
 
+void PlayPrograms(Transcript& script, const HostOptions& options) {
+    script.Step("A unique name next to the names taken",
+                "program TIOGenUniqueName.gx --input 0=text:Valve --input \"1=list:Valve|Valve1\"",
+                {0, {"4 = \"Valve2\""}, {}}, [&](std::ostream& out, std::ostream& err) {
+                    return RunProgram(options, "TIOGenUniqueName.gx",
+                                      {"0=text:Valve", "1=list:Valve|Valve1"}, out, err);
+                });
+    // A dialog in a session without a user answers what the session was told to.
+    HostOptions answered = options;
+    answered.answers = {"select-resource:0=0", "select-resource:1=text:Connector1/DIO5"};
+    script.Step("The resource dialog, answered from the session",
+                "--answer select-resource:0=0 --answer select-resource:1=text:Connector1/DIO5 "
+                "program TIOSelectResourceDialog.gx --input 9=text:Connector0/DIO3",
+                {0, {"0 = 0", "1 = \"Connector1/DIO5\""}, {}},
+                [&](std::ostream& out, std::ostream& err) {
+                    return RunProgram(answered, "TIOSelectResourceDialog.gx",
+                                      {"9=text:Connector0/DIO3"}, out, err);
+                });
+    script.Step("Without answers the dialog is closed: cancelled, the resource kept",
+                "program TIOSelectResourceDialog.gx --input 9=text:Connector0/DIO3",
+                {0, {"0 = 1", "1 = \"Connector0/DIO3\""}, {}},
+                [&](std::ostream& out, std::ostream& err) {
+                    return RunProgram(options, "TIOSelectResourceDialog.gx",
+                                      {"9=text:Connector0/DIO3"}, out, err);
+                });
+}
+
 } // namespace
 
 int RunDemo(const HostOptions& options, const DemoSettings& settings, std::ostream& out,
@@ -266,6 +294,7 @@ int RunDemo(const HostOptions& options, const DemoSettings& settings, std::ostre
     PlayDescriptions(script, options, settings.examples);
     PlayProject(script, options, settings.examples, work);
     PlayEdits(script, options, work);
+    PlayPrograms(script, options);
     if (script.Failures() != 0) {
         out << "demo: " << script.Failures() << " of " << script.Steps()
             << " steps did not give what they should\n";
