@@ -209,10 +209,14 @@ TEST_F(SessionTest, AProjectWithItemsAndPropertiesReadsBackUnchangedWhenReopened
     ASSERT_TRUE(wbhost::project::ReadWholeFile(path, again, nullptr));
     EXPECT_EQ(again, saved);
 
-    // A file that does not open leaves the session without a project, and says why.
-    EXPECT_FALSE(session.OpenProject(scratch.File("missing.wbproj"), &error));
-    EXPECT_NE(error.find("missing.wbproj"), std::string::npos);
-    EXPECT_EQ(session.Project(), nullptr);
+    // A file that does not open says why and leaves the open project as it was.
+    ASSERT_EQ(BagOf(&session.Project()->Root())->SetInt(u"unsaved", 1, 0), S_OK);
+    const std::string before = Text();
+    EXPECT_FALSE(session.OpenProject(scratch.Write("bad.wbproj", "wbhost-project 1\n"), &error));
+    EXPECT_NE(error.find("bad.wbproj"), std::string::npos);
+    ASSERT_NE(session.Project(), nullptr);
+    EXPECT_EQ(Text(), before);
+    EXPECT_EQ(session.ProjectPath(), path);
 }
 
 TEST_F(SessionTest, ProvidersHearOfTheSaveAroundTheWriteAndOneThatRefusesStopsIt) {

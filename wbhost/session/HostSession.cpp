@@ -97,12 +97,14 @@ bool HostSession::NewProject(std::u16string name, std::string* error) {
 }
 
 bool HostSession::OpenProject(const std::string& path, std::string* error) {
-    Close();
+    // The open project stays until the new one has been read: a file that does not open must not
+    // cost the work in memory.
     auto project = project::Project::Open(path, *resources_, error,
                                           provider_ ? project::ProviderFactory(provider_)
                                                     : project::Project::ObjectFactory{});
     if (!project)
         return false;
+    Close();
     if (!Attach(std::move(project), true, error))
         return false;
     projectPath_ = path;

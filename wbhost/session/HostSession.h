@@ -37,9 +37,10 @@ public:
     // Closes the open project and starts an empty one called NAME (empty: "Project"), with the
     // provider (if any) attached. False with a message in ERROR when the provider refuses.
     bool NewProject(std::u16string name, std::string* error);
-    // Closes the open project and reads the project file PATH, the provider making its items;
-    // the provider is attached as to a reloaded project. False with a message in ERROR (the
-    // session is left without project) when the file cannot be read or is refused.
+    // Reads the project file PATH, the provider making its items, and puts it in place of the
+    // open project; the provider is attached as to a reloaded project. False with a message in
+    // ERROR when the file cannot be read or is refused: the open project is then kept, unless
+    // it was the provider's attach that failed (the session is left without project).
     bool OpenProject(const std::string& path, std::string* error);
     // Saves the project to PATH (empty: the file it was opened from or last saved to): the
     // providers hear ProjectSaving before anything is written and ProjectSaved after. False with
