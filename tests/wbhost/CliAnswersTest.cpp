@@ -1,0 +1,93 @@
+// Answers for dialog programs as the command line takes them, and the printed run log.
+#include "ProjectTestSupport.h"
+#include "cli/Answers.h"
+
+#include <gtest/gtest.h>
+#include <sstream>
+
+using projecttest::ScratchFolder;
+using wbhost::cli::AddAnswer;
+using wbhost::cli::ApplyAnswers;
+using wbhost::cli::LoadAnswerFile;
+using wbhost::runner::ProgramSession;
+using wbhost::runner::ProgramValue;
+
+namespace {
+
+TEST(CliAnswers, RefusesMisspeltBehavioursAndMalformedTextsWithoutSettingAnything) {
+    ProgramSession session;
+    std::string error;
+    // A behaviour nobody runs would be accepted by the session and never used.
+    EXPECT_FALSE(AddAnswer("select-resorce:0=1", session, error));
+    EXPECT_NE(error.find("no program behaviour is called \"select-resorce\""), std::string::npos);
+    for (const char* bad : {"select-resource", "select-resource:0", ":0=1", "select-resource:x=1",
+                            "select-resource:0=maybe", "select-resource:0="}) {
+        error.clear();
+        EXPECT_FALSE(AddAnswer(bad, session, error)) << bad;
+        EXPECT_FALSE(error.empty()) << bad;
+    }
+    EXPECT_TRUE(session.AnswersFor("select-resource").empty());
+
+    ASSERT_TRUE(AddAnswer("new-item-wizard:3=list:a|b", session, error)) << error;
+    EXPECT_EQ(session.AnswersFor("new-item-wizard").at(3),
+              ProgramValue(std::vector<std::u16string>{u"a", u"b"}));
+}
+
+TEST(CliAnswers, FilesSkipCommentsAndBlanksAndNameTheBadLine) {
+    ScratchFolder scratch;
+    const std::string good =
+        scratch.Write("good.txt", "# answers for the wizard\r\n\r\n  new-item-wizard:0=0  \r\n"
+                                  "select-resource:1=text:Connector0/DIO1\n");
+    ProgramSession session;
+    std::string error;
+    ASSERT_TRUE(LoadAnswerFile(good, session, error)) << error;
+    EXPECT_EQ(session.AnswersFor("new-item-wizard").at(0), ProgramValue(0));
+    // The carriage return of a Windows line end is not part of the text.
+    EXPECT_EQ(session.AnswersFor("select-resource").at(1),
+              ProgramValue(std::u16string(u"Connector0/DIO1")));
+
+    const std::string bad =
+        scratch.Write("bad.txt", "explain-error:0=1\n# fine so far\nexplain-error 0=1\n");
+    EXPECT_FALSE(LoadAnswerFile(bad, session, error));
+    EXPECT_EQ(error.rfind(bad + ": line 3: ", 0), 0u) << error;
+    EXPECT_EQ(session.AnswersFor("explain-error").at(0), ProgramValue(1));
+
+    EXPECT_FALSE(LoadAnswerFile(scratch.File("missing.txt"), session, error));
+    EXPECT_NE(error.find("cannot read the answer file"), std::string::npos);
+    EXPECT_FALSE(LoadAnswerFile(scratch.Path(), session, error));
+}
+
+TEST(CliAnswers, SingleAnswersOverrideTheFiles) {
+    ScratchFolder scratch;
+    const std::string file = scratch.Write("a.txt", "properties:0=1\nproperties:2=5\n");
+    ProgramSession session;
+    std::string error;
+    ASSERT_TRUE(ApplyAnswers({file}, {"properties:0=0"}, session, error)) << error;
+    EXPECT_EQ(session.AnswersFor("properties").at(0), ProgramValue(0));
+    EXPECT_EQ(session.AnswersFor("properties").at(2), ProgramValue(5));
+    EXPECT_FALSE(ApplyAnswers({}, {"properties:0=0", "nope"}, session, error));
+}
+
+TEST(CliAnswers, RunLogShowsEveryKindOfValueOnItsOwnLine) {
+    ProgramSession session;
+    std::ostringstream none;
+    wbhost::cli::PrintRuns(session, none);
+    EXPECT_EQ(none.str(), "no programs ran\n");
+
+    session.Record({"/x/private/TIOPropertyMain.gx",
+                    "properties",
+                    {{9, std::vector<std::u16string>{u"a\"b", u"two\nlines"}},
+                     {11, wbhost::runner::HostReference{42}}},
+                    {{0, 1}, {1, std::u16string(u"back\\slash")}}});
+    std::ostringstream log;
+    wbhost::cli::PrintRuns(session, log);
+    EXPECT_EQ(log.str(), "TIOPropertyMain.gx (properties)\n"
+                         "  inputs:\n"
+                         "    9 = [\"a\\\"b\", \"two\\nlines\"]\n"
+                         "    11 = ref 42\n"
+                         "  outputs:\n"
+                         "    0 = 1\n"
+                         "    1 = \"back\\\\slash\"\n");
+}
+
+} // namespace

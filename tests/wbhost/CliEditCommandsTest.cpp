@@ -1,0 +1,126 @@
+// `wbhost edit`: a target's tree changed, its items listed, the change kept with the project.
+#include "CliTestSupport.h"
+#include "cli/Commands.h"
+#include "cli/EditCommands.h"
+#include "cli/ProjectCommands.h"
+
+using clitest::Options;
+using clitest::ScratchProject;
+using clitest::Slurp;
+using namespace wbhost::cli;
+
+namespace {
+
+class CliEdit : public ::testing::Test {
+protected:
+    void SetUp() override {
+        ASSERT_EQ(p.Run([&](std::ostream& out, std::ostream& err) {
+            return RunProjectNew(Options(), p.path, {"T=" + p.description}, false, out, err);
+        }),
+                  kProjectOk)
+            << p.err.str();
+        ASSERT_EQ(p.Run([&](std::ostream& out, std::ostream& err) {
+            return RunAddItem(Options(), p.path, {"T", "DIO0", "Valve"}, out, err);
+        }),
+                  kProjectOk)
+            << p.err.str();
+    }
+    int Edit(const std::string& action, const std::vector<std::string>& arguments) {
+        EditRequest request{"T", EditKind::Rename, "", ""};
+        std::string error;
+        if (!ParseEdit(action, arguments, request, error)) {
+            p.err << error;
+            return -1;
+        }
+        return p.Run([&](std::ostream& out, std::ostream& err) {
+            return RunEdit(Options(), p.path, request, out, err);
+        });
+    }
+    // The dump of the node PATH of the tree the project now refers to; empty when absent.
+    std::string KeptNode(const std::string& path) {
+        std::ostringstream out;
+        std::ostringstream err;
+        return RunTree(WBT_MODULE_PATH, EditedDescriptionPath(p.path, u"T"), path, out, err) == 0
+                   ? out.str()
+                   : std::string();
+    }
+    ScratchProject p;
+};
+
+TEST(CliEditParse, EachActionTakesItsOwnArguments) {
+    EditRequest request;
+    std::string error;
+    ASSERT_TRUE(ParseEdit("rename", {"A/B", "C"}, request, error));
+    EXPECT_EQ(request.kind, EditKind::Rename);
+    EXPECT_EQ(request.node, "A/B");
+    EXPECT_EQ(request.argument, "C");
+    ASSERT_TRUE(ParseEdit("remove", {"A"}, request, error));
+    EXPECT_EQ(request.kind, EditKind::Remove);
+    EXPECT_EQ(request.argument, "");
+    ASSERT_TRUE(ParseEdit("insert", {"/", "part.xml"}, request, error));
+    EXPECT_EQ(request.kind, EditKind::Insert);
+    EXPECT_FALSE(ParseEdit("rename", {"A"}, request, error));
+    EXPECT_NE(error.find("rename NODE NEWNAME"), std::string::npos);
+    EXPECT_FALSE(ParseEdit("remove", {"A", "B"}, request, error));
+    EXPECT_FALSE(ParseEdit("move", {"A", "B"}, request, error));
+}
+
+TEST(CliEditParse, KeptDescriptionNamesArePlainFileNames) {
+    EXPECT_EQ(EditedDescriptionPath("/p/x.wbproj", u"K40"), "/p/x.wbproj.K40.xml");
+    EXPECT_EQ(EditedDescriptionPath("x", u"../a b/\u00e9"), "x.___a_b___.xml");
+}
+
+TEST_F(CliEdit, EditsReachTheReopenedProjectAndNeverTheOriginalDescription) {
+    const std::string original = Slurp(p.description);
+    ASSERT_EQ(Edit("rename", {"DIO0", "Valve0"}), 0) << p.err.str();
+    EXPECT_NE(p.out.str().find("renamed /DIO0 to \"Valve0\""), std::string::npos);
+    EXPECT_NE(p.out.str().find("Tangent I/O item \"Valve\""), std::string::npos) << p.out.str();
+    EXPECT_NE(Slurp(p.path).find(EditedDescriptionPath(p.path, u"T")), std::string::npos);
+
+    // The second edit starts from the first one's tree, read back through the project.
+    ASSERT_EQ(Edit("remove", {"AI0"}), 0) << p.err.str();
+    const std::string part = p.scratch.Write(
+        "part.xml", "<Line name=\"DIO1\"><IOInterface>DigitalLine</IOInterface></Line>");
+    ASSERT_EQ(Edit("insert", {"/", part}), 0) << p.err.str();
+    EXPECT_NE(KeptNode("Valve0"), "");
+    EXPECT_EQ(KeptNode("DIO0"), "");
+    EXPECT_EQ(KeptNode("AI0"), "");
+    EXPECT_NE(KeptNode("DIO1").find("<IOInterface>DigitalLine</IOInterface>"), std::string::npos);
+    EXPECT_EQ(Slurp(p.description), original);
+
+    // Items can be added for what was inserted.
+    EXPECT_EQ(p.Run([&](std::ostream& out, std::ostream& err) {
+        return RunAddItem(Options(), p.path, {"T", "DIO1", ""}, out, err);
+    }),
+              kProjectOk)
+        << p.err.str();
+}
+
+TEST_F(CliEdit, RefusedEditsChangeNoFile) {
+    const std::string saved = Slurp(p.path);
+    const std::string broken = p.scratch.Write("broken.xml", "<Line name=\"X\"><Oops></Line>");
+    const struct {
+        const char* action;
+        std::vector<std::string> arguments;
+        const char* says;
+    } refusals[] = {
+        {"rename", {"DIO9", "X"}, "no node \"DIO9\""},
+        {"rename", {"DIO0", "AI0"}, "cannot rename /DIO0"},
+        {"rename", {"DIO0", ""}, "cannot rename"},
+        {"remove", {"/"}, "root of a target cannot be removed"},
+        {"remove", {"AI0/X"}, "no node"},
+        {"insert", {"DIO9", broken}, "no node"},
+        {"insert", {"/", broken}, "does not load"},
+        {"insert", {"/", p.scratch.File("missing.xml")}, "cannot read"},
+    };
+    for (const auto& each : refusals) {
+        EXPECT_EQ(Edit(each.action, each.arguments), 1) << each.says;
+        EXPECT_NE(p.err.str().find(each.says), std::string::npos) << p.err.str();
+        EXPECT_EQ(Slurp(p.path), saved) << each.says;
+        EXPECT_FALSE(std::filesystem::exists(EditedDescriptionPath(p.path, u"T"))) << each.says;
+    }
+    EditRequest request{"U", EditKind::Remove, "AI0", ""};
+    EXPECT_EQ(RunEdit(Options(), p.path, request, p.out, p.err), 1);
+}
+
+} // namespace
