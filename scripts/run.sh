@@ -1,7 +1,9 @@
 #!/usr/bin/env bash
 # The main job on a fresh machine: installs what the build needs, builds the module and the
 # embedded host (release), then has wbhost load and check the bundled target description and
-# compare it with two others. Exits 0 when every answer is the expected one.
+# compare it with two others, then plays a whole session (a project with a target, items added,
+# saved, reopened, the target's tree edited) with `wbhost demo`. Exits 0 when every answer is the
+# expected one.
 set -euo pipefail
 cd "$(dirname "$0")/.."
 scripts/setup.sh
@@ -37,6 +39,9 @@ echo "== Comparing descriptions (required first, offered second)"
 run 0 compare examples/KestrelK40.xml examples/KestrelK40.xml
 run 2 compare examples/KestrelK40.xml examples/KestrelK40X.xml
 run 1 compare examples/KestrelK40.xml examples/KestrelK20.xml
+
+echo "== A whole session: a project with the K-40, items, reopening, edits of its tree"
+run 0 demo --examples examples
 
 if [ "$failures" -ne 0 ]; then
   echo "run: $failures unexpected answer(s)" >&2
