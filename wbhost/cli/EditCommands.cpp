@@ -6,6 +6,8 @@
 #include "project/AtomicFile.h"
 #include "resource_tree/ResTreeWriter.h"
 
+#include <filesystem>
+#include <optional>
 #include <ostream>
 
 namespace wbhost::cli {
@@ -63,6 +65,38 @@ bool ApplyEdit(resources::ResourceTree& tree, const EditRequest& request, std::o
     }
     }
     return false;
+}
+
+// Writes TREE to the file KEPT, atomically; PREVIOUS receives what KEPT held (nullopt: there
+// was no such file), so a failed save can put it back. False with the reason on ERR.
+bool KeepTree(resources::ResourceTree& tree, const std::string& kept,
+              std::optional<std::string>& previous, std::ostream& err) {
+    std::string content;
+    if (project::ReadWholeFile(kept, content, nullptr))
+        previous = std::move(content);
+    const wbhw::ResTreeDocument document = [&] {
+        const std::lock_guard hold(tree.Mutex());
+        return wbhw::WriteResTree(tree.Root());
+    }();
+    if (!document.faithful)
+        err << "warning: some texts of the changed tree (loader variables in prototypes, for "
+               "example) read back differently from "
+            << kept << "\n";
+    std::string error;
+    if (project::WriteFileAtomically(kept, ToUtf8(document.xml), &error))
+        return true;
+    err << "wbhost: cannot keep the changed tree: " << error << "\n";
+    return false;
+}
+
+// Puts the file KEPT back as KeepTree found it.
+void RestoreKept(const std::string& kept, const std::optional<std::string>& previous) {
+    if (previous) {
+        project::WriteFileAtomically(kept, *previous, nullptr);
+        return;
+    }
+    std::error_code ignored;
+    std::filesystem::remove(kept, ignored);
 }
 
 } // namespace
@@ -127,18 +161,13 @@ int RunEdit(const HostOptions& options, const std::string& projectPath, const Ed
     // The project refers to its targets' descriptions, so the changed tree must outlive this
     // process or a reopened project would show its items the tree they no longer follow.
     const std::string kept = AbsolutePath(EditedDescriptionPath(projectPath, target->Name()));
-    const wbhw::ResTreeDocument document = [&] {
-        const std::lock_guard hold(tree.Mutex());
-        return wbhw::WriteResTree(tree.Root());
-    }();
-    if (!document.faithful)
-        err << "warning: parts of the changed tree may read back differently from " << kept << "\n";
-    if (!project::WriteFileAtomically(kept, ToUtf8(document.xml), &error)) {
-        err << "wbhost: cannot keep the changed tree: " << error << "\n";
+    std::optional<std::string> previous;
+    if (!KeepTree(tree, kept, previous, err))
         return 1;
-    }
     target->SetDescriptionFile(kept);
     if (!session.Save(projectPath, &error)) {
+        // The project file still refers to what it did; so must the kept tree.
+        RestoreKept(kept, previous);
         err << "wbhost: " << error << "\n";
         return 1;
     }
