@@ -9,7 +9,6 @@
 
 #include <cstdint>
 #include <fstream>
-#include <iomanip>
 #include <optional>
 #include <ostream>
 #include <sstream>
@@ -30,12 +29,6 @@ std::optional<std::string> ReadFile(const std::string& path) {
     if (in.bad())
         return std::nullopt;
     return content.str();
-}
-
-std::string Hex(int32_t status) {
-    std::ostringstream text;
-    text << "0x" << std::hex << std::setw(8) << std::setfill('0') << static_cast<uint32_t>(status);
-    return text.str();
 }
 
 // Host programs hand the module multibyte text in the system's code page; descriptions and
@@ -76,7 +69,7 @@ int RunTree(const std::string& modulePath, const std::string& file, const std::s
     uint8_t found = 0;
     const int32_t status = dump(&target->refnum, pathText.get(), dumpText.get(), &found);
     if (status < 0) {
-        err << "wbhost: TIOResTree_Dump failed with status " << Hex(status) << "\n";
+        err << "wbhost: TIOResTree_Dump failed with status " << HexStatus(status) << "\n";
         return kTreeFailed;
     }
     if (found == 0) {

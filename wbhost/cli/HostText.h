@@ -4,6 +4,7 @@
 
 #include "host/binding/runtime_api.h"
 
+#include <cstdint>
 #include <memory>
 #include <string>
 #include <string_view>
@@ -14,6 +15,9 @@ namespace wbhost::cli {
 std::u16string FromUtf8(std::string_view text);
 // UTF-16 to UTF-8; unpaired surrogates become U+FFFD.
 std::string ToUtf8(std::u16string_view text);
+
+// STATUS as eight hex digits after "0x", as statuses are written in messages.
+std::string HexStatus(int32_t status);
 
 // Gives a handle back to the host (a null handle is ignored by the host).
 struct HandleDisposer {

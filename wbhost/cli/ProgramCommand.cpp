@@ -9,21 +9,13 @@
 #include "host/contracts/IwbProgramRunnerService.h"
 
 #include <filesystem>
-#include <iomanip>
 #include <ostream>
-#include <sstream>
 
 namespace wbhost::cli {
 namespace {
 
 using qv::com::ComPtr;
 namespace fs = std::filesystem;
-
-std::string Hex(HRESULT status) {
-    std::ostringstream text;
-    text << "0x" << std::hex << std::setw(8) << std::setfill('0') << static_cast<uint32_t>(status);
-    return text.str();
-}
 
 HRESULT SetInput(IwbProgram& program, uint32_t index, const runner::ProgramValue& value) {
     if (const auto* number = std::get_if<int32_t>(&value))
@@ -81,25 +73,26 @@ int RunProgram(const HostOptions& options, const std::string& file,
         status = service->CreateInstance(wbproj::kProgramRunnerClass, IwbProgramRunner::iid,
                                          runner.PutVoid());
     if (FAILED(status)) {
-        err << "wbhost: no program runner (status " << Hex(status) << ")\n";
+        err << "wbhost: no program runner (status " << HexStatus(status) << ")\n";
         return 1;
     }
     const std::string path = LocateProgram(file, options.modulePath);
     ComPtr<IwbProgram> program;
     status = runner->OpenProgram(FromUtf8(path).c_str(), program.Put());
     if (FAILED(status)) {
-        err << "wbhost: cannot open the program " << path << " (status " << Hex(status) << ")\n";
+        err << "wbhost: cannot open the program " << path << " (status " << HexStatus(status)
+            << ")\n";
         return 1;
     }
     for (const auto& [index, value] : terminals) {
         if (status = SetInput(*program.Get(), index, value); FAILED(status)) {
-            err << "wbhost: the program refuses input " << index << " (status " << Hex(status)
+            err << "wbhost: the program refuses input " << index << " (status " << HexStatus(status)
                 << ")\n";
             return 1;
         }
     }
     if (status = program->Run(); FAILED(status)) {
-        err << "wbhost: the program failed (status " << Hex(status) << ")\n";
+        err << "wbhost: the program failed (status " << HexStatus(status) << ")\n";
         return 1;
     }
     const std::vector<runner::ProgramRun> runs = session.Programs().Runs();

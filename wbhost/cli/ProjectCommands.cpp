@@ -8,21 +8,13 @@
 #include "provider/TIOIdentifiers.h"
 
 #include <filesystem>
-#include <iomanip>
 #include <ostream>
 #include <set>
-#include <sstream>
 
 namespace wbhost::cli {
 namespace {
 
 using project::ProjectItem;
-
-std::string Hex(HRESULT status) {
-    std::ostringstream text;
-    text << "0x" << std::hex << std::setw(8) << std::setfill('0') << static_cast<uint32_t>(status);
-    return text.str();
-}
 
 // The child of PARENT called NAME (without regard to case), or null.
 ProjectItem* ChildNamed(const ProjectItem& parent, std::u16string_view name) {
@@ -60,7 +52,7 @@ ProjectItem* FolderIn(ProjectItem& parent, const std::u16string& folderName, std
     if (const HRESULT made = parent.CreateChild(wbproj::kFolderType, folderName.c_str(), nullptr);
         FAILED(made)) {
         err << "wbhost: cannot make the folder \"" << ToUtf8(folderName) << "\" (status "
-            << Hex(made) << ")\n";
+            << HexStatus(made) << ")\n";
         return nullptr;
     }
     return ChildNamed(parent, folderName);
@@ -95,7 +87,7 @@ ProjectItem* NewIOItem(ProjectItem& target, ProjectItem& parent, const std::u16s
     if (const HRESULT made = parent.CreateChild(tio::kIOItemType, name.c_str(), nullptr);
         FAILED(made)) {
         err << "wbhost: the module's provider cannot make a Tangent I/O item now (status "
-            << Hex(made) << ")\n";
+            << HexStatus(made) << ")\n";
         return nullptr;
     }
     ProjectItem* item = ChildNamed(parent, name);
