@@ -12,18 +12,22 @@ namespace wbhw {
 void AppendUtf8AsUtf16(std::string_view utf8, std::u16string& out) {
     // Markup is nearly all ASCII; widen that directly and leave the rest to ICU, which also turns
     // four-byte sequences into surrogate pairs.
+    // This runs for every name, value and run of text of a load: the widening goes through plain
+    // pointers so that the compiler can do it many characters at a time.
     const size_t ascii = qv::kern::AsciiPrefixLength(utf8);
     const size_t base = out.size();
     out.resize(base + utf8.size());
+    char16_t* const to = out.data() + base;
+    const auto* const from = reinterpret_cast<const unsigned char*>(utf8.data());
     for (size_t i = 0; i < ascii; ++i)
-        out[base + i] = static_cast<char16_t>(utf8[i]);
+        to[i] = from[i];
     if (ascii == utf8.size())
         return;
     int32_t written = 0;
     UErrorCode status = U_ZERO_ERROR;
-    u_strFromUTF8WithSub(out.data() + base + ascii, static_cast<int32_t>(utf8.size() - ascii),
-                         &written, utf8.data() + ascii, static_cast<int32_t>(utf8.size() - ascii),
-                         0xFFFD, nullptr, &status);
+    u_strFromUTF8WithSub(to + ascii, static_cast<int32_t>(utf8.size() - ascii), &written,
+                         utf8.data() + ascii, static_cast<int32_t>(utf8.size() - ascii), 0xFFFD,
+                         nullptr, &status);
     out.resize(base + ascii + (U_SUCCESS(status) ? static_cast<size_t>(written) : 0));
 }
 
@@ -89,39 +93,40 @@ std::string_view ExPatHandler::InputContext(int& offset) const noexcept {
     return {context, static_cast<size_t>(size)};
 }
 
+void ExPatHandler::StartElementUtf8(const char* name, const char** attributes) {
+    name_.clear();
+    AppendUtf8AsUtf16(name, name_);
+    attributes_.clear();
+    for (const char** a = attributes; a[0] != nullptr; a += 2)
+        attributes_.InsertUtf8(a[0], a[1]);
+    StartElement(name_, attributes_);
+}
+
+void ExPatHandler::EndElementUtf8(const char* name) {
+    name_.clear();
+    AppendUtf8AsUtf16(name, name_);
+    EndElement(name_);
+}
+
+void ExPatHandler::CharacterDataUtf8(std::string_view text) {
+    text_.clear();
+    AppendUtf8AsUtf16(text, text_);
+    CharacterData(text_);
+}
+
 void XMLCALL ExPatHandler::OnStart(void* self, const XML_Char* name, const XML_Char** atts) {
     auto* h = static_cast<ExPatHandler*>(self);
-    h->Guarded([&] {
-        h->name_.clear();
-        AppendUtf8AsUtf16(name, h->name_);
-        h->attributes_.clear();
-        for (const XML_Char** a = atts; a[0] != nullptr; a += 2) {
-            std::u16string key;
-            std::u16string value;
-            AppendUtf8AsUtf16(a[0], key);
-            AppendUtf8AsUtf16(a[1], value);
-            h->attributes_.Insert(std::move(key), std::move(value));
-        }
-        h->StartElement(h->name_, h->attributes_);
-    });
+    h->Guarded([&] { h->StartElementUtf8(name, atts); });
 }
 
 void XMLCALL ExPatHandler::OnEnd(void* self, const XML_Char* name) {
     auto* h = static_cast<ExPatHandler*>(self);
-    h->Guarded([&] {
-        h->name_.clear();
-        AppendUtf8AsUtf16(name, h->name_);
-        h->EndElement(h->name_);
-    });
+    h->Guarded([&] { h->EndElementUtf8(name); });
 }
 
 void XMLCALL ExPatHandler::OnText(void* self, const XML_Char* text, int length) {
     auto* h = static_cast<ExPatHandler*>(self);
-    h->Guarded([&] {
-        h->text_.clear();
-        AppendUtf8AsUtf16(std::string_view(text, static_cast<size_t>(length)), h->text_);
-        h->CharacterData(h->text_);
-    });
+    h->Guarded([&] { h->CharacterDataUtf8(std::string_view(text, static_cast<size_t>(length))); });
 }
 
 void XMLCALL ExPatHandler::OnPi(void* self, const XML_Char* target, const XML_Char* data) {

@@ -56,6 +56,14 @@ public:
     // The underlying parser, for callers that need more of Expat's state.
     XML_Parser Parser() const noexcept { return parser_.get(); }
 
+protected:
+    // The element, end and text events in the UTF-8 that Expat hands over (ATTRIBUTES: name,
+    // value, ..., null). These convert into the adapter's buffers and call the operations above;
+    // a handler that keeps buffers of its own overrides them and converts straight into those.
+    virtual void StartElementUtf8(const char* name, const char** attributes);
+    virtual void EndElementUtf8(const char* name);
+    virtual void CharacterDataUtf8(std::string_view text);
+
 private:
     struct ParserFree {
         void operator()(XML_Parser p) const noexcept { XML_ParserFree(p); }

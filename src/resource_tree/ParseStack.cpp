@@ -81,30 +81,58 @@ void ParseStack::Pop() noexcept {
     --depth_;
 }
 
-void ParseStack::SetPending(Frame& frame, const std::u16string& name, const XmlAttributes& atts) {
+void ParseStack::OpenPending(Frame& frame) noexcept {
     frame.hasPending = true;
-    frame.pendingName = name;
-    frame.pendingAttributes = atts;
     frame.text.clear();
     frame.pendingNames.clear();
     frame.linkChildrenReported = false;
 }
 
-void ParseStack::StartElement(const std::u16string& name, const XmlAttributes& attributes) {
+void ParseStack::SetPending(Frame& frame, const std::u16string& name, const XmlAttributes& atts) {
+    OpenPending(frame);
+    frame.pendingName = name;
+    frame.pendingAttributes = atts;
+}
+
+void ParseStack::SetPendingUtf8(Frame& frame, const char* name, const char** attributes) {
+    OpenPending(frame);
+    frame.pendingName.clear();
+    AppendUtf8AsUtf16(name, frame.pendingName);
+    frame.pendingAttributes.clear();
+    for (const char** a = attributes; a[0] != nullptr; a += 2)
+        frame.pendingAttributes.InsertUtf8(a[0], a[1]);
+}
+
+ParseStack::Frame* ParseStack::FrameForStart() {
     Frame& frame = Top();
     if (frame.ignoreDepth > 0) {
         ++frame.ignoreDepth;
-        return;
+        return nullptr;
     }
-    if (!frame.hasPending) {
-        SetPending(frame, name, attributes);
-        return;
-    }
-    if (Frame* target = ProcessPending(frame, true))
+    if (!frame.hasPending)
+        return &frame;
+    return ProcessPending(frame, true);
+}
+
+void ParseStack::StartElement(const std::u16string& name, const XmlAttributes& attributes) {
+    if (Frame* target = FrameForStart())
         SetPending(*target, name, attributes);
 }
 
+void ParseStack::StartElementUtf8(const char* name, const char** attributes) {
+    if (Frame* target = FrameForStart())
+        SetPendingUtf8(*target, name, attributes);
+}
+
 void ParseStack::EndElement(const std::u16string& name) {
+    FinishElement(nullptr, &name);
+}
+
+void ParseStack::EndElementUtf8(const char* name) {
+    FinishElement(name, nullptr);
+}
+
+void ParseStack::FinishElement(const char* utf8, const std::u16string* wide) {
     Frame& frame = Top();
     if (frame.ignoreDepth > 0) {
         --frame.ignoreDepth;
@@ -116,7 +144,10 @@ void ParseStack::EndElement(const std::u16string& name) {
     if (frame.capturing) {
         if (frame.captureDepth >= 2) {
             std::u16string closing = u"</";
-            closing += name;
+            if (wide != nullptr)
+                closing += *wide;
+            else
+                AppendUtf8AsUtf16(utf8, closing);
             closing += u">";
             frame.node->AppendTextAt(frame.position, closing);
             --frame.captureDepth;
@@ -132,10 +163,18 @@ void ParseStack::EndElement(const std::u16string& name) {
     top.pendingNames.clear();
 }
 
+// Text counts only inside a pending element: what stands between elements (mostly line breaks
+// and indentation) would be dropped when the next element starts, so it is not gathered.
 void ParseStack::CharacterData(std::u16string_view text) {
     Frame& frame = Top();
-    if (frame.ignoreDepth == 0)
+    if (frame.hasPending && frame.ignoreDepth == 0)
         frame.text += text;
+}
+
+void ParseStack::CharacterDataUtf8(std::string_view text) {
+    Frame& frame = Top();
+    if (frame.hasPending && frame.ignoreDepth == 0)
+        AppendUtf8AsUtf16(text, frame.text);
 }
 
 ParseStack::Steering ParseStack::ReadSteering(const XmlAttributes& attributes) {
