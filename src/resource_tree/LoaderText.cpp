@@ -6,6 +6,7 @@
 #include "resource_tree/ExPatHandler.h"
 #include "resource_tree/ListText.h"
 
+#include <algorithm>
 #include <array>
 #include <unistd.h>
 
@@ -103,22 +104,28 @@ std::string FindHostDirectory() {
     }
 }
 
-void AppendUtf8(char32_t c, std::string& out) {
+// Writes the UTF-8 bytes of C at TO; answers how many.
+size_t WriteUtf8(char32_t c, char* to) noexcept {
     if (c < 0x80) {
-        out.push_back(static_cast<char>(c));
-    } else if (c < 0x800) {
-        out.push_back(static_cast<char>(0xC0 | (c >> 6)));
-        out.push_back(static_cast<char>(0x80 | (c & 0x3F)));
-    } else if (c < 0x10000) {
-        out.push_back(static_cast<char>(0xE0 | (c >> 12)));
-        out.push_back(static_cast<char>(0x80 | ((c >> 6) & 0x3F)));
-        out.push_back(static_cast<char>(0x80 | (c & 0x3F)));
-    } else {
-        out.push_back(static_cast<char>(0xF0 | (c >> 18)));
-        out.push_back(static_cast<char>(0x80 | ((c >> 12) & 0x3F)));
-        out.push_back(static_cast<char>(0x80 | ((c >> 6) & 0x3F)));
-        out.push_back(static_cast<char>(0x80 | (c & 0x3F)));
+        to[0] = static_cast<char>(c);
+        return 1;
     }
+    if (c < 0x800) {
+        to[0] = static_cast<char>(0xC0 | (c >> 6));
+        to[1] = static_cast<char>(0x80 | (c & 0x3F));
+        return 2;
+    }
+    if (c < 0x10000) {
+        to[0] = static_cast<char>(0xE0 | (c >> 12));
+        to[1] = static_cast<char>(0x80 | ((c >> 6) & 0x3F));
+        to[2] = static_cast<char>(0x80 | (c & 0x3F));
+        return 3;
+    }
+    to[0] = static_cast<char>(0xF0 | (c >> 18));
+    to[1] = static_cast<char>(0x80 | ((c >> 12) & 0x3F));
+    to[2] = static_cast<char>(0x80 | ((c >> 6) & 0x3F));
+    to[3] = static_cast<char>(0x80 | (c & 0x3F));
+    return 4;
 }
 
 } // namespace
@@ -213,10 +220,14 @@ std::u16string LocalizeText(std::u16string_view value, std::u16string_view langu
     return stored;
 }
 
+bool IsPlatformPathText(std::u16string_view text) noexcept {
+    return text.find(u'\\') == std::u16string_view::npos &&
+           text.find(u"//") == std::u16string_view::npos && (text.empty() || text.back() != u'/');
+}
+
 std::u16string PlatformPathText(std::u16string_view text) {
     // Most paths are already in the platform's form: no escapes, no empty pieces.
-    if (text.find(u'\\') == std::u16string_view::npos &&
-        text.find(u"//") == std::u16string_view::npos && (text.empty() || text.back() != u'/'))
+    if (IsPlatformPathText(text))
         return std::u16string(text);
     std::u16string out;
     // A leading separator keeps the path absolute; other empty pieces join to nothing.
@@ -250,32 +261,38 @@ std::u16string DecimalText(uint64_t value) {
 }
 
 std::string ToUtf8(std::u16string_view text) {
-    // Markup is nearly all ASCII: that part is narrowed in one pass into a buffer of its size.
-    const size_t ascii = qv::kern::AsciiPrefixLength(text);
-    std::string out;
-    out.reserve(text.size() + (text.size() - ascii) / 2);
-    // One sized write, not a push_back per character: this loop runs over whole documents.
-    out.resize(ascii);
-    for (size_t i = 0; i < ascii; ++i)
-        out[i] = static_cast<char>(text[i]);
-    if (ascii == text.size())
-        return out;
-    for (size_t i = ascii; i < text.size(); ++i) {
-        const char16_t c = text[i];
-        if (c < 0x80) {
-            out.push_back(static_cast<char>(c));
-            continue;
-        }
-        if (c >= 0xD800 && c < 0xDC00 && i + 1 < text.size() && text[i + 1] >= 0xDC00 &&
+    // A whole document goes through here before Expat sees it, and markup is nearly all ASCII:
+    // runs of it are narrowed through plain pointers, which the compiler does many characters at
+    // a time. The buffer starts at one byte per unit (enough for ASCII) and grows only for what
+    // needs more.
+    std::string out(text.size(), '\0');
+    size_t used = 0;
+    for (size_t i = 0; i < text.size();) {
+        const size_t ascii = qv::kern::AsciiPrefixLength(text.substr(i));
+        char* const to = out.data() + used;
+        const char16_t* const from = text.data() + i;
+        for (size_t k = 0; k < ascii; ++k)
+            to[k] = static_cast<char>(from[k]);
+        used += ascii;
+        i += ascii;
+        if (i == text.size())
+            break;
+        char32_t code = text[i];
+        size_t units = 1;
+        if (code >= 0xD800 && code < 0xDC00 && i + 1 < text.size() && text[i + 1] >= 0xDC00 &&
             text[i + 1] < 0xE000) {
-            const char32_t code = 0x10000 + ((static_cast<char32_t>(c) - 0xD800) << 10) +
-                                  (static_cast<char32_t>(text[i + 1]) - 0xDC00);
-            AppendUtf8(code, out);
-            ++i;
-            continue;
+            code =
+                0x10000 + ((code - 0xD800) << 10) + (static_cast<char32_t>(text[i + 1]) - 0xDC00);
+            units = 2;
         }
-        AppendUtf8(c, out);
+        i += units;
+        // Room for this character's bytes and one byte for each unit still to come.
+        const size_t needed = used + 4 + (text.size() - i);
+        if (needed > out.size())
+            out.resize(std::max(needed, out.size() + out.size() / 2));
+        used += WriteUtf8(code, out.data() + used);
     }
+    out.resize(used);
     return out;
 }
 

@@ -40,6 +40,8 @@ std::u16string LocalizeText(std::u16string_view value, std::u16string_view langu
 
 // A "/"-separated path text rebuilt in the platform's form (pieces joined with the path join).
 std::u16string PlatformPathText(std::u16string_view text);
+// True when PlatformPathText would give TEXT back unchanged (no escapes, no empty pieces).
+bool IsPlatformPathText(std::u16string_view text) noexcept;
 
 // BASE and RELATIVE joined with the platform separator; RELATIVE alone when it is absolute.
 std::string JoinFilePath(const std::string& base, const std::string& relative);

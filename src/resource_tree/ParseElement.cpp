@@ -176,7 +176,7 @@ void ParseStack::ProcessText(Frame& frame, const std::u16string& name, const Ste
     const bool isPath = steering.type != nullptr ? Equals(steering.type, u"path") : tag.isPathText;
     const bool isReferenceList =
         steering.type != nullptr ? Equals(steering.type, u"ref-list") : tag.isReserves;
-    if (isPath)
+    if (isPath && !IsPlatformPathText(text))
         text = PlatformPathText(text);
     if (tag.isLink) {
         ProcessLink(frame, name, text, steering);
@@ -202,6 +202,12 @@ void ParseStack::ProcessText(Frame& frame, const std::u16string& name, const Ste
 
 std::u16string ParseStack::RewriteReferenceList(ResTreeNode& node,
                                                 const std::u16string& text) const {
+    // One relative reference with nothing to unescape comes out as it went in, trimmed; most
+    // lists are of that kind, and splitting and joining them costs more than the rest of the text.
+    const std::u16string_view trimmed = TrimBlanks(text);
+    if (trimmed.find_first_of(u",\\") == std::u16string_view::npos &&
+        (trimmed.empty() || trimmed.front() != u'/'))
+        return std::u16string(trimmed);
     std::vector<std::u16string> pieces = SplitListText(text, u',', true);
     WString base;
     for (std::u16string& piece : pieces) {
