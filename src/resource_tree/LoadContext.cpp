@@ -46,22 +46,20 @@ void SetDefaultLoaderSettings(const LoaderSettings& settings) {
 }
 
 const TagInfo& LoadContext::ClassifyTag(const std::u16string& tag) {
-    const auto found = tags.find(tag);
-    if (found != tags.end())
-        return found->second;
+    if (const TagInfo* known = tags.Find(tag))
+        return *known;
     TagInfo info;
     info.isLink = qv::kern::EqualsNoCase(tag, u":Link");
     info.isInclude = qv::kern::EqualsNoCase(tag, u":Include");
     info.isPathText = info.isInclude || EndsWithNoCase(tag, u"Path") || EndsWithNoCase(tag, u"Dir");
     info.isReserves = qv::kern::EqualsNoCase(tag, u"Reserves");
     info.isListType = IsListType(tag);
-    return tags.emplace(tag, info).first->second;
+    return tags.Add(tag, info);
 }
 
 LoaderAttribute LoadContext::ClassifyAttribute(const std::u16string& name) {
-    const auto found = attributes.find(name);
-    if (found != attributes.end())
-        return found->second;
+    if (const LoaderAttribute* known = attributes.Find(name))
+        return *known;
     LoaderAttribute kind = LoaderAttribute::Other;
     for (const auto& [word, value] : kAttributes) {
         if (qv::kern::EqualsNoCase(name, word)) {
@@ -69,8 +67,7 @@ LoaderAttribute LoadContext::ClassifyAttribute(const std::u16string& name) {
             break;
         }
     }
-    attributes.emplace(name, kind);
-    return kind;
+    return attributes.Add(name, kind);
 }
 
 LoadScope::LoadScope(const LoaderSettings* settings, bool isLoad)

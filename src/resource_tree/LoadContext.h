@@ -2,11 +2,11 @@
 #pragma once
 
 #include "resource_tree/LoaderSettings.h"
+#include "resource_tree/SpellingTable.h"
 
 #include <cstdint>
 #include <memory>
 #include <string>
-#include <unordered_map>
 
 namespace wbhw {
 
@@ -48,8 +48,8 @@ struct LoadContext {
     ParseStack* innermost = nullptr;
     // Names compare without regard to case in the user's locale, which is not cheap; a document
     // repeats a handful of tags and attribute names, so each spelling is classified once.
-    std::unordered_map<std::u16string, TagInfo> tags;
-    std::unordered_map<std::u16string, LoaderAttribute> attributes;
+    SpellingTable<TagInfo> tags;
+    SpellingTable<LoaderAttribute> attributes;
 
     const TagInfo& ClassifyTag(const std::u16string& tag);
     LoaderAttribute ClassifyAttribute(const std::u16string& name);
