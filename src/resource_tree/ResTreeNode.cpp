@@ -137,13 +137,12 @@ ResTreeNode::Position ResTreeNode::InsertEntry(Position position, WString&& name
             IndexInserted(made, before == list_.end());
         return Position(made);
     }
-    const auto hint = set_.lower_bound(std::u16string_view(name));
-    if (hint != set_.end() && qv::kern::EqualsNoCase(hint->Name(), name)) {
-        inserted = false;
-        return Position(hint);
-    }
-    inserted = true;
-    return Position(set_.emplace_hint(hint, std::move(name), kind));
+    // One descent of the tree both finds the place and tells whether the name is taken; a lookup
+    // first and an insertion at its hint would compare the name a few more times (and names
+    // compare in the user's locale).
+    const auto [at, isNew] = set_.emplace(std::move(name), kind);
+    inserted = isNew;
+    return Position(at);
 }
 
 ResTreeNode::AddResult ResTreeNode::AddText(Position position, WString name, WString text,
