@@ -30,12 +30,15 @@ struct Expect {
 // Writes each step's command and output and checks them against what they should be.
 class Transcript {
 public:
-    Transcript(std::ostream& out, std::ostream& err) : out_(out), err_(err) {}
+    // A transcript that writes the folder FOLDER (the work folder) as "./", so its commands
+    // read as typed there.
+    Transcript(std::ostream& out, std::ostream& err, std::string folder)
+        : out_(out), err_(err), folder_(std::move(folder)) {}
 
     // Runs WORK as the command COMMAND and shows at most MAXLINES lines of its output.
     void Step(const std::string& title, const std::string& command, const Expect& expect,
               const Work& work, size_t maxLines = 40) {
-        out_ << "== " << ++steps_ << ". " << title << "\n$ wbhost " << command << "\n";
+        out_ << "== " << ++steps_ << ". " << title << "\n$ wbhost " << Shorten(command) << "\n";
         std::ostringstream output;
         std::ostringstream problems;
         int exit = 0;
@@ -69,8 +72,14 @@ public:
     int Failures() const noexcept { return failures_; }
 
 private:
+    std::string Shorten(std::string text) const {
+        const std::string prefix = folder_ + "/";
+        for (size_t at = text.find(prefix); at != std::string::npos; at = text.find(prefix, at))
+            text.replace(at, prefix.size(), "./");
+        return text;
+    }
     void Show(const std::string& text, const char* prefix, size_t maxLines) {
-        std::istringstream lines(text);
+        std::istringstream lines(Shorten(text));
         std::string line;
         size_t count = 0;
         while (std::getline(lines, line)) {
@@ -82,6 +91,7 @@ private:
     }
     std::ostream& out_;
     std::ostream& err_;
+    const std::string folder_;
     int steps_ = 0;
     int failures_ = 0;
 };
@@ -111,6 +121,7 @@ public:
     WorkFolder& operator=(const WorkFolder&) = delete;
     bool Usable() const { return !path_.empty() && fs::is_directory(path_); }
     std::string File(const std::string& name) const { return (fs::path(path_) / name).string(); }
+    const std::string& Path() const noexcept { return path_; }
 
 private:
     std::string path_;
@@ -290,7 +301,8 @@ int RunDemo(const HostOptions& options, const DemoSettings& settings, std::ostre
         err << "demo: " << settings.examples << " does not hold the example descriptions\n";
         return 1;
     }
-    Transcript script(out, err);
+    out << "(working in " << work.Path() << ", written ./ below)\n\n";
+    Transcript script(out, err, work.Path());
     PlayDescriptions(script, options, settings.examples);
     PlayProject(script, options, settings.examples, work);
     PlayEdits(script, options, work);
