@@ -79,8 +79,8 @@ bool KeepTree(resources::ResourceTree& tree, const std::string& kept,
         return wbhw::WriteResTree(tree.Root());
     }();
     if (!document.faithful)
-        err << "warning: some texts of the changed tree (loader variables in prototypes, for "
-               "example) read back differently from "
+        err << "warning: parts of the changed tree (a link that leads nowhere now, for example) "
+               "do not read back the same from "
             << kept << "\n";
     std::string error;
     if (project::WriteFileAtomically(kept, ToUtf8(document.xml), &error))
