@@ -98,20 +98,23 @@ TEST(RuntimeVariant, ElementsOfAZeroFilledHostArrayAreVariantsOnFirstUse) {
     auto slot = [&](int i) {
         return reinterpret_cast<WBVariant>(static_cast<char*>(*list) + 8 + 8 * i);
     };
+    // What the host keeps in a slot: the variant the slot stands for once it is in use.
+    auto stored = [&](int i) {
+        WBVariant value = nullptr;
+        std::memcpy(&value, static_cast<const char*>(*list) + 8 + 8 * i, sizeof value);
+        return value;
+    };
     EXPECT_EQ(GetText(slot(0), "n", kWBArgErr), "<none>"); // reading does not create
     ASSERT_EQ(SetText(slot(0), "n", "DIO0"), kWBNoErr);
     ASSERT_EQ(WbVariantPStrSetUI32Attr(slot(1), Name("f").get(), 1), kWBNoErr);
     EXPECT_EQ(GetText(slot(0), "n"), "DIO0");
-    WBVariant held = nullptr;
-    std::memcpy(&held, slot(0), sizeof held);
-    EXPECT_EQ(GetText(held, "n"), "DIO0");
+    EXPECT_EQ(GetText(stored(0), "n"), "DIO0");
     // A slot past the block, or straddling its end, is not a variant.
     EXPECT_EQ(SetText(reinterpret_cast<WBVariant>(static_cast<char*>(*list) + 20), "n", "x"),
               kWBArgErr);
     EXPECT_EQ(WbVariantDestroy(slot(0)), kWBNoErr);
     EXPECT_EQ(WbVariantDestroy(slot(1)), kWBNoErr);
-    std::memcpy(&held, slot(0), sizeof held);
-    EXPECT_EQ(held, nullptr);
+    EXPECT_EQ(stored(0), nullptr);
     EXPECT_EQ(WbVariantDestroy(slot(0)), kWBArgErr);
     DSDisposeHandle(list);
     EXPECT_EQ(wbhost::runtime::VariantTable::Instance().LiveCount(), live);
