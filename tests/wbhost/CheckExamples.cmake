@@ -1,26 +1,7 @@
 # Runs wbhost tree and wbhost compare on the bundled examples and checks what they print and
 # how they exit.
 
-# Runs wbhost with ARGN; fails unless it exits with EXPECTED. Leaves stdout in OUT, stderr in ERR.
-function(run_wbhost expected)
-  execute_process(COMMAND ${WBHOST} ${ARGN} OUTPUT_VARIABLE out ERROR_VARIABLE err
-                  RESULT_VARIABLE rc)
-  if(NOT rc STREQUAL "${expected}")
-    message(FATAL_ERROR "wbhost ${ARGN}: exit ${rc}, expected ${expected}\n${out}\n${err}")
-  endif()
-  set(OUT "${out}" PARENT_SCOPE)
-  set(ERR "${err}" PARENT_SCOPE)
-endfunction()
-
-# Fails unless TEXT contains every one of ARGN.
-function(expect_all text)
-  foreach(piece IN LISTS ARGN)
-    string(FIND "${text}" "${piece}" at)
-    if(at EQUAL -1)
-      message(FATAL_ERROR "missing \"${piece}\" in:\n${text}")
-    endif()
-  endforeach()
-endfunction()
+include(${CMAKE_CURRENT_LIST_DIR}/RunWbhost.cmake)
 
 # The whole board: prototype copies with their variables, both connectors, the link, the included
 # timing part, the host set and the localized name with its language list.

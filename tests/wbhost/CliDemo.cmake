@@ -1,30 +1,7 @@
 # Runs the real wbhost executable: its demo on the bundled examples, and the project, edit and
 # program commands as a user types them (repeated options, host options after the subcommand).
 
-# Runs wbhost with ARGN; fails unless it exits with EXPECTED ("usage": any code of a refused
-# command line). Leaves stdout in OUT, stderr in ERR.
-function(run_wbhost expected)
-  execute_process(COMMAND ${WBHOST} ${ARGN} OUTPUT_VARIABLE out ERROR_VARIABLE err
-                  RESULT_VARIABLE rc)
-  if(expected STREQUAL "usage" AND rc GREATER 100)
-    set(expected ${rc})
-  endif()
-  if(NOT rc STREQUAL "${expected}")
-    message(FATAL_ERROR "wbhost ${ARGN}: exit ${rc}, expected ${expected}\n${out}\n${err}")
-  endif()
-  set(OUT "${out}" PARENT_SCOPE)
-  set(ERR "${err}" PARENT_SCOPE)
-endfunction()
-
-# Fails unless TEXT contains every one of ARGN.
-function(expect_all text)
-  foreach(piece IN LISTS ARGN)
-    string(FIND "${text}" "${piece}" at)
-    if(at EQUAL -1)
-      message(FATAL_ERROR "missing \"${piece}\" in:\n${text}")
-    endif()
-  endforeach()
-endfunction()
+include(${CMAKE_CURRENT_LIST_DIR}/RunWbhost.cmake)
 
 file(REMOVE_RECURSE ${SCRATCH})
 file(MAKE_DIRECTORY ${SCRATCH})

@@ -143,13 +143,8 @@ std::string EditedDescriptionPath(const std::string& projectPath, std::u16string
 int RunEdit(const HostOptions& options, const std::string& projectPath, const EditRequest& request,
             std::ostream& out, std::ostream& err) {
     session::HostSession session;
-    std::string error;
-    if (!StartSession(options, session, err))
+    if (!StartProjectSession(options, session, projectPath, err))
         return 1;
-    if (!session.OpenProject(projectPath, &error)) {
-        err << "wbhost: " << error << "\n";
-        return 1;
-    }
     project::Project& project = *session.Project();
     ProjectItem* target = FindTarget(project, request.target, err);
     if (target == nullptr)
@@ -165,6 +160,7 @@ int RunEdit(const HostOptions& options, const std::string& projectPath, const Ed
     if (!KeepTree(tree, kept, previous, err))
         return 1;
     target->SetDescriptionFile(kept);
+    std::string error;
     if (!session.Save(projectPath, &error)) {
         // The project file still refers to what it did; so must the kept tree.
         RestoreKept(kept, previous);

@@ -23,6 +23,18 @@ bool StartSession(const HostOptions& options, session::HostSession& session, std
     return true;
 }
 
+bool StartProjectSession(const HostOptions& options, session::HostSession& session,
+                         const std::string& projectPath, std::ostream& err) {
+    if (!StartSession(options, session, err))
+        return false;
+    std::string error;
+    if (!session.OpenProject(projectPath, &error)) {
+        err << "wbhost: " << error << "\n";
+        return false;
+    }
+    return true;
+}
+
 void FinishSession(const HostOptions& options, session::HostSession& session, std::ostream& out) {
     if (!options.record)
         return;

@@ -21,6 +21,11 @@ struct HostOptions {
 // with the reason on ERR, when the module does not load or an answer is malformed.
 bool StartSession(const HostOptions& options, session::HostSession& session, std::ostream& err);
 
+// StartSession, then opens the project file PROJECTPATH in SESSION. False, with the reason on
+// ERR, when either fails.
+bool StartProjectSession(const HostOptions& options, session::HostSession& session,
+                         const std::string& projectPath, std::ostream& err);
+
 // Prints the recorded program runs of SESSION on OUT when OPTIONS ask for them.
 void FinishSession(const HostOptions& options, session::HostSession& session, std::ostream& out);
 

@@ -168,13 +168,8 @@ int RunProjectNew(const HostOptions& options, const std::string& projectPath,
 int RunProjectList(const HostOptions& options, const std::string& projectPath, std::ostream& out,
                    std::ostream& err) {
     session::HostSession session;
-    std::string error;
-    if (!StartSession(options, session, err))
+    if (!StartProjectSession(options, session, projectPath, err))
         return kProjectFailed;
-    if (!session.OpenProject(projectPath, &error)) {
-        err << "wbhost: " << error << "\n";
-        return kProjectFailed;
-    }
     PrintItemTree(session.Project()->Root(), out);
     FinishSession(options, session, out);
     return kProjectOk;
@@ -183,13 +178,8 @@ int RunProjectList(const HostOptions& options, const std::string& projectPath, s
 int RunAddItem(const HostOptions& options, const std::string& projectPath,
                const AddItemRequest& request, std::ostream& out, std::ostream& err) {
     session::HostSession session;
-    std::string error;
-    if (!StartSession(options, session, err))
+    if (!StartProjectSession(options, session, projectPath, err))
         return kProjectFailed;
-    if (!session.OpenProject(projectPath, &error)) {
-        err << "wbhost: " << error << "\n";
-        return kProjectFailed;
-    }
     project::Project& project = *session.Project();
     ProjectItem* target = FindTarget(project, request.target, err);
     if (target == nullptr)
