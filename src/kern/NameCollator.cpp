@@ -183,15 +183,20 @@ int NameCollator::CompareRanks(std::u16string_view a, std::u16string_view b) con
     const size_t common = std::min(a.size(), b.size());
     size_t i = 0;
     for (; i < common; ++i) {
-        const uint8_t x = a[i] < 128 ? ranks_[a[i]] : 0;
-        const uint8_t y = b[i] < 128 ? ranks_[b[i]] : 0;
+        const char16_t p = a[i];
+        const char16_t q = b[i];
+        // Units beyond the table have no rank; one bit test covers both.
+        if ((p | q) >= 128)
+            return 2;
+        const uint8_t x = ranks_[p];
+        const uint8_t y = ranks_[q];
         if (x == 0 || y == 0)
             return 2;
         if (x == y)
             continue;
         // Characters before this one cannot reach past it in a contraction (they would have to
         // start one that continues with ranked characters only); this one might.
-        if ((contractionStarts_[a[i]] || contractionStarts_[b[i]]) &&
+        if ((contractionStarts_[p] || contractionStarts_[q]) &&
             !(AllRanked(a.substr(i)) && AllRanked(b.substr(i))))
             return 2;
         return x < y ? -1 : 1;
@@ -216,19 +221,20 @@ int NameCollator::CompareWithCollator(std::u16string_view a, std::u16string_view
 }
 
 int NameCollator::Compare(std::u16string_view a, std::u16string_view b) const noexcept {
-    if (collator_ == nullptr)
-        return 0;
-    // Texts identical unit for unit are equal in every collation; a lookup by the stored
-    // spelling is the common case, and a block compare settles it fastest.
-    // (A null text is empty and must not reach memcmp.)
-    if (a.size() == b.size() &&
-        (a.empty() || std::memcmp(a.data(), b.data(), a.size() * sizeof(char16_t)) == 0))
-        return 0;
+    // The rank walk settles ASCII names, identical ones included, in one pass; every lookup of a
+    // name in a node or a loader table comes here, so it goes first.
     if (fastPath_) {
         const int answer = CompareRanks(a, b);
         if (answer != 2)
             return answer;
     }
+    if (collator_ == nullptr)
+        return 0;
+    // Texts identical unit for unit are equal in every collation, without asking ICU.
+    // (A null text is empty and must not reach memcmp.)
+    if (a.size() == b.size() &&
+        (a.empty() || std::memcmp(a.data(), b.data(), a.size() * sizeof(char16_t)) == 0))
+        return 0;
     return CompareWithCollator(a, b);
 }
 
