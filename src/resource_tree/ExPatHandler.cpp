@@ -1,8 +1,6 @@
 // The adapter between Expat and wide-string event handlers.
 #include "resource_tree/ExPatHandler.h"
 
-#include "kern/AsciiRun.h"
-
 #include <cstring>
 #include <new>
 #include <unicode/ustring.h>
@@ -11,23 +9,24 @@ namespace wbhw {
 
 void AppendUtf8AsUtf16(std::string_view utf8, std::u16string& out) {
     // Markup is nearly all ASCII; widen that directly and leave the rest to ICU, which also turns
-    // four-byte sequences into surrogate pairs.
-    // This runs for every name, value and run of text of a load: the widening goes through plain
-    // pointers so that the compiler can do it many characters at a time.
-    const size_t ascii = qv::kern::AsciiPrefixLength(utf8);
+    // four-byte sequences into surrogate pairs. This runs for every name, value and run of text
+    // of a load, mostly a few characters long: one plain loop over them beats a scan followed by
+    // a copy.
     const size_t base = out.size();
-    out.resize(base + utf8.size());
+    const size_t size = utf8.size();
+    out.resize(base + size);
     char16_t* const to = out.data() + base;
     const auto* const from = reinterpret_cast<const unsigned char*>(utf8.data());
-    for (size_t i = 0; i < ascii; ++i)
-        to[i] = from[i];
-    if (ascii == utf8.size())
+    size_t ascii = 0;
+    for (; ascii < size && from[ascii] < 0x80u; ++ascii)
+        to[ascii] = from[ascii];
+    if (ascii == size)
         return;
     int32_t written = 0;
     UErrorCode status = U_ZERO_ERROR;
-    u_strFromUTF8WithSub(to + ascii, static_cast<int32_t>(utf8.size() - ascii), &written,
-                         utf8.data() + ascii, static_cast<int32_t>(utf8.size() - ascii), 0xFFFD,
-                         nullptr, &status);
+    u_strFromUTF8WithSub(to + ascii, static_cast<int32_t>(size - ascii), &written,
+                         utf8.data() + ascii, static_cast<int32_t>(size - ascii), 0xFFFD, nullptr,
+                         &status);
     out.resize(base + ascii + (U_SUCCESS(status) ? static_cast<size_t>(written) : 0));
 }
 
