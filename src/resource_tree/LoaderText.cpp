@@ -104,6 +104,17 @@ std::string FindHostDirectory() {
     }
 }
 
+// Narrows the leading ASCII units of FROM into TO; answers how many. The caller hands over one
+// block at a time, so the scan and the copy read the units from the cache, and the copy through
+// plain pointers is one the compiler widens to many units per step.
+size_t NarrowAscii(std::u16string_view from, char* to) noexcept {
+    const size_t ascii = qv::kern::AsciiPrefixLength(from);
+    const char16_t* const units = from.data();
+    for (size_t i = 0; i < ascii; ++i)
+        to[i] = static_cast<char>(units[i]);
+    return ascii;
+}
+
 // Writes the UTF-8 bytes of C at TO; answers how many.
 size_t WriteUtf8(char32_t c, char* to) noexcept {
     if (c < 0x80) {
@@ -261,38 +272,40 @@ std::u16string DecimalText(uint64_t value) {
 }
 
 std::string ToUtf8(std::u16string_view text) {
-    // A whole document goes through here before Expat sees it, and markup is nearly all ASCII:
-    // runs of it are narrowed through plain pointers, which the compiler does many characters at
-    // a time. The buffer starts at one byte per unit (enough for ASCII) and grows only for what
-    // needs more.
-    std::string out(text.size(), '\0');
-    size_t used = 0;
-    for (size_t i = 0; i < text.size();) {
-        const size_t ascii = qv::kern::AsciiPrefixLength(text.substr(i));
-        char* const to = out.data() + used;
-        const char16_t* const from = text.data() + i;
-        for (size_t k = 0; k < ascii; ++k)
-            to[k] = static_cast<char>(from[k]);
-        used += ascii;
-        i += ascii;
-        if (i == text.size())
-            break;
-        char32_t code = text[i];
-        size_t units = 1;
-        if (code >= 0xD800 && code < 0xDC00 && i + 1 < text.size() && text[i + 1] >= 0xDC00 &&
-            text[i + 1] < 0xE000) {
-            code =
-                0x10000 + ((code - 0xD800) << 10) + (static_cast<char32_t>(text[i + 1]) - 0xDC00);
-            units = 2;
+    // A whole document goes through here before Expat sees it, and markup is nearly all ASCII.
+    // The output is made ready one block at a time, so that its zero fill and the narrowing
+    // meet the same cache lines; the room for one byte per unit is reserved at once.
+    constexpr size_t kBlock = 16384;
+    std::string out;
+    out.reserve(text.size());
+    size_t i = 0;
+    while (i < text.size()) {
+        const size_t end = i + std::min(kBlock, text.size() - i);
+        size_t used = out.size();
+        out.resize(used + (end - i));
+        while (i < end) {
+            const size_t ascii = NarrowAscii(text.substr(i, end - i), out.data() + used);
+            used += ascii;
+            i += ascii;
+            if (i == end)
+                break;
+            char32_t code = text[i];
+            size_t units = 1;
+            if (code >= 0xD800 && code < 0xDC00 && i + 1 < text.size() && text[i + 1] >= 0xDC00 &&
+                text[i + 1] < 0xE000) {
+                code = 0x10000 + ((code - 0xD800) << 10) +
+                       (static_cast<char32_t>(text[i + 1]) - 0xDC00);
+                units = 2; // a pair may end one unit past the block
+            }
+            i += units;
+            // Room for this character's bytes and one byte for each unit left in the block.
+            const size_t needed = used + 4 + (i < end ? end - i : 0);
+            if (needed > out.size())
+                out.resize(std::max(needed, out.size() + out.size() / 2));
+            used += WriteUtf8(code, out.data() + used);
         }
-        i += units;
-        // Room for this character's bytes and one byte for each unit still to come.
-        const size_t needed = used + 4 + (text.size() - i);
-        if (needed > out.size())
-            out.resize(std::max(needed, out.size() + out.size() / 2));
-        used += WriteUtf8(code, out.data() + used);
+        out.resize(used);
     }
-    out.resize(used);
     return out;
 }
 

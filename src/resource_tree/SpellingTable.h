@@ -1,6 +1,7 @@
 // A small table from the spellings of tags and attribute names to what the loader made of them.
 #pragma once
 
+#include <algorithm>
 #include <cstdint>
 #include <string>
 #include <string_view>
@@ -22,7 +23,7 @@ public:
             const Slot& slot = slots_[i];
             if (!slot.used)
                 return nullptr;
-            if (slot.key == text)
+            if (Same(slot.key, text))
                 return &slot.value;
         }
     }
@@ -41,11 +42,26 @@ private:
         bool used = false;
     };
 
+    // The length and a few units from both ends tell a document's spellings apart well enough;
+    // hashing every unit costs more than the rare extra probe.
     static size_t Hash(std::u16string_view text) noexcept {
-        uint64_t hash = 0xcbf29ce484222325ull; // FNV-1a
-        for (const char16_t unit : text)
-            hash = (hash ^ unit) * 0x100000001b3ull;
+        uint64_t hash = 0xcbf29ce484222325ull ^ text.size(); // FNV-1a
+        const size_t ends = std::min<size_t>(text.size(), 4);
+        for (size_t i = 0; i < ends; ++i) {
+            hash = (hash ^ text[i]) * 0x100000001b3ull;
+            hash = (hash ^ text[text.size() - 1 - i]) * 0x100000001b3ull;
+        }
         return static_cast<size_t>(hash ^ (hash >> 29));
+    }
+    // Spellings are a few units long: a plain loop beats a call of memcmp.
+    static bool Same(const std::u16string& key, std::u16string_view text) noexcept {
+        if (key.size() != text.size())
+            return false;
+        for (size_t i = 0; i < text.size(); ++i) {
+            if (key[i] != text[i])
+                return false;
+        }
+        return true;
     }
     size_t Mask() const noexcept { return slots_.size() - 1; }
     const Value& Place(std::u16string key, const Value& value) {
