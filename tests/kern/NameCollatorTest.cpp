@@ -109,3 +109,16 @@ TEST(NameCollator, TailoredLettersKeepTheirLocalMeaning) {
     EXPECT_EQ(NameCollator("cs").Compare(u"chata", u"hrad"), 1);
     EXPECT_EQ(NameCollator("").Compare(u"chata", u"hrad"), -1);
 }
+
+TEST(NameCollator, IdenticalTextsAreEqualWhateverTheyHold) {
+    // The rank walk meets identical texts first; those it cannot rank must still come out equal
+    // (a text compared with its own copy is how most lookups end).
+    for (const char* locale : {"", "tr", "cs", "en@colAlternate=shifted"}) {
+        const NameCollator collator(locale);
+        for (const std::u16string text :
+             {u"", u"DIO0", u"a_b", u"\u00E9t\u00E9", u"ch\u0307", u"x\x01y", u"\U0001F600"}) {
+            const std::u16string copy = text;
+            EXPECT_EQ(collator.Compare(text, copy), 0) << locale;
+        }
+    }
+}

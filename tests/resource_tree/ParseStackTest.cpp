@@ -148,6 +148,40 @@ TEST(ParseStack, PathTextsAndReferenceLists) {
     EXPECT_EQ(root->ReservedNodes(true), std::vector<ResTreeNode*>{ChildOf(*root, u"m")});
 }
 
+TEST(ParseStack, OnlyTheTextInsideALeafIsGathered) {
+    auto root = Load(uR"(<Top>lead
+        <A>  x  <!-- a comment splits the text --> y </A>between
+        <B xml:space="preserve"> p <![CDATA[<q>]]> </B>tail
+        <G>stray<C>1</C>after C</G>
+        <:Link name="l">C<ignored>inner</ignored> </:Link>
+    </Top>)");
+    EXPECT_EQ(TextOf(*root, u"A"), u"x   y");
+    EXPECT_EQ(TextOf(*root, u"B"), u" p <q> ");
+    ResTreeNode* g = ChildOf(*root, u"G");
+    ASSERT_NE(g, nullptr);
+    EXPECT_EQ(Names(*g), std::vector<std::u16string>{u"C"});
+    EXPECT_EQ(TextOf(*g, u"C"), u"1");
+    EXPECT_EQ(root->EntryCount(), 4u + 1u); // A, B, G, the link's text and the message
+}
+
+TEST(ParseStack, ReferenceListsOfOneReferenceAreTrimmedOrRewrittenAsLongerOnes) {
+    auto root = Load(uR"(<Top>
+        <Group name="g">
+            <Reserves xml:space="preserve">  ../b  </Reserves>
+            <Mine type="ref-list" xml:space="preserve"> /Top/g/x </Mine>
+            <Esc type="ref-list">x\y</Esc>
+            <Blank type="ref-list" xml:space="preserve">   </Blank>
+        </Group>
+    </Top>)");
+    ResTreeNode* g = ChildOf(*root, u"g");
+    ASSERT_NE(g, nullptr);
+    EXPECT_EQ(TextOf(*g, u"Reserves"), u"../b");
+    // An absolute reference is found after trimming, even with blanks kept around it.
+    EXPECT_EQ(TextOf(*g, u"Mine"), u"../Top/g/x");
+    EXPECT_EQ(TextOf(*g, u"Esc"), u"x\\y");
+    EXPECT_EQ(TextOf(*g, u"Blank"), u"");
+}
+
 TEST(ParseStack, SyntaxErrorsAccumulateWithLineColumnAndContext) {
     ResTreeNode root(u"", u"", false);
     const std::u16string bad = u"<Top>\n<A>1</A>\n<B>\n</Top>\n";

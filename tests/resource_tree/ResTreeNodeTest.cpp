@@ -26,6 +26,31 @@ TEST(ResTreeNode, UnorderedNodesKeepOneEntryPerNameRegardlessOfCase) {
     EXPECT_EQ(child.node, nullptr);
 }
 
+TEST(ResTreeNode, UnorderedNodesSortManyNamesAndAnswerTheFirstOfEachSpelling) {
+    ResTreeNode node(u"n", u"IOResource", false);
+    // Names arrive out of order, and every fourth one again in other case.
+    for (int i = 0; i < 200; ++i) {
+        const int k = (i * 73) % 200;
+        const std::u16string name = u"Pin" +
+                                    std::u16string(1, static_cast<char16_t>(u'a' + k / 26)) +
+                                    std::u16string(1, static_cast<char16_t>(u'a' + k % 26));
+        EXPECT_TRUE(node.AddText(node.End(), name, u"first").inserted);
+        if (k % 4 == 0) {
+            std::u16string upper = name;
+            for (char16_t& c : upper)
+                c = (c >= u'a' && c <= u'z') ? static_cast<char16_t>(c - 32) : c;
+            const auto again = node.AddChild(node.End(), upper, u"X", false);
+            EXPECT_FALSE(again.created);
+            EXPECT_EQ(again.position->Name(), name);
+        }
+    }
+    EXPECT_EQ(node.EntryCount(), 200u);
+    const std::vector<std::u16string> names = Names(node);
+    for (size_t i = 1; i < names.size(); ++i)
+        EXPECT_LT(qv::kern::CompareNoCase(names[i - 1], names[i]), 0) << i;
+    EXPECT_EQ(*node.Find(u"PINHB")->Text(), u"first");
+}
+
 TEST(ResTreeNode, OrderedNodesKeepDuplicatesInInsertionOrder) {
     ResTreeNode node(u"n", u"ResourceList", true);
     node.AddText(node.End(), u"Pin", u"first");

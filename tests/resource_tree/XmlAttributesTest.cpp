@@ -1,0 +1,54 @@
+// Attribute sets: sorted, first spelling wins, and strings reused from one element to the next.
+#include "resource_tree/XmlAttributes.h"
+
+#include <gtest/gtest.h>
+#include <string>
+#include <vector>
+
+namespace wbhw {
+namespace {
+
+std::vector<std::u16string> Keys(const XmlAttributes& atts) {
+    std::vector<std::u16string> keys;
+    for (const auto& [key, value] : atts)
+        keys.push_back(key + u"=" + value);
+    return keys;
+}
+
+TEST(XmlAttributes, ASetRefilledAfterClearingShowsOnlyTheNewAttributes) {
+    XmlAttributes atts;
+    EXPECT_TRUE(atts.InsertUtf8("Zeta", "last"));
+    EXPECT_TRUE(atts.InsertUtf8("alpha", "a long value that needs its own buffer"));
+    EXPECT_TRUE(atts.InsertUtf8("Name", "n"));
+    EXPECT_FALSE(atts.InsertUtf8("NAME", "second spelling"));
+    EXPECT_EQ(Keys(atts),
+              (std::vector<std::u16string>{u"alpha=a long value that needs its own buffer",
+                                           u"Name=n", u"Zeta=last"}));
+
+    // The next element has fewer attributes; none of the old ones may show through.
+    atts.clear();
+    EXPECT_TRUE(atts.empty());
+    EXPECT_EQ(atts.Find(u"zeta"), nullptr);
+    EXPECT_TRUE(atts.InsertUtf8("name", "\xC3\xA9t\xC3\xA9 \xF0\x9F\x98\x80"));
+    EXPECT_EQ(atts.size(), 1u);
+    EXPECT_EQ(Keys(atts), (std::vector<std::u16string>{u"name=\u00E9t\u00E9 \U0001F600"}));
+    EXPECT_EQ(atts.Get(u"alpha"), u"");
+}
+
+TEST(XmlAttributes, ErasingAndCopyingKeepTheOrderAndTheCount) {
+    XmlAttributes atts;
+    for (const char* name : {"d", "b", "c", "a"})
+        atts.Insert(std::u16string(name, name + 1), u"v");
+    atts.Erase(u"B");
+    atts.Erase(u"missing");
+    EXPECT_EQ(Keys(atts), (std::vector<std::u16string>{u"a=v", u"c=v", u"d=v"}));
+    // The erased entry's place is reused by the next insertion, in sorted order.
+    EXPECT_TRUE(atts.Insert(u"bb", u"w"));
+    const XmlAttributes copy = atts;
+    atts.clear();
+    EXPECT_EQ(Keys(copy), (std::vector<std::u16string>{u"a=v", u"bb=w", u"c=v", u"d=v"}));
+    EXPECT_TRUE(copy.Contains(u"BB"));
+}
+
+} // namespace
+} // namespace wbhw
