@@ -83,6 +83,7 @@ const Document& DocumentOf(int megabytes) {
 // Seconds per iteration of the raw parse and of the load, per size, for the ratios.
 std::map<int, double> expatSeconds;
 std::map<int, double> loadNsPerElement;
+std::map<int, double> loadCpuNsPerElement;
 
 void XMLCALL NoStart(void*, const XML_Char*, const XML_Char**) {}
 void XMLCALL NoEnd(void*, const XML_Char*) {}
@@ -157,6 +158,12 @@ void BM_LoadText(benchmark::State& state) {
     state.SetBytesProcessed(static_cast<int64_t>(state.iterations() * doc.utf8.size()));
     state.counters["ratio_to_expat"] = seconds / expatSeconds[size];
     state.counters["paired_cpu_ratio"] = pairedLoad / pairedExpat;
+    const double cpuNsPerElement = pairedLoad * 1e9 / static_cast<double>(state.iterations()) /
+                                   static_cast<double>(doc.elements);
+    state.counters["cpu_ns_per_element"] = cpuNsPerElement;
+    loadCpuNsPerElement[size] = cpuNsPerElement;
+    if (size != 1 && loadCpuNsPerElement.contains(1))
+        state.counters["cpu_per_element_vs_1MB"] = cpuNsPerElement / loadCpuNsPerElement[1];
     state.counters["ns_per_element"] = seconds * 1e9 / static_cast<double>(doc.elements);
     state.counters["bytes_per_element"] =
         static_cast<double>(heapBytes) / static_cast<double>(doc.elements);
