@@ -230,7 +230,7 @@ bool ResTreeNode::SetTextKindAt(Position position, EntryKind kind) {
     return true;
 }
 
-void ResTreeNode::IndexInserted(std::list<ResTreeEntry>::iterator entry, bool atEnd) {
+void ResTreeNode::IndexInserted(EntryList::iterator entry, bool atEnd) {
     const auto [at, isNew] = index_->emplace(std::u16string_view(entry->name_), entry);
     if (isNew || atEnd)
         return;
@@ -244,7 +244,7 @@ void ResTreeNode::IndexInserted(std::list<ResTreeEntry>::iterator entry, bool at
     }
 }
 
-void ResTreeNode::IndexErasing(std::list<ResTreeEntry>::iterator entry) {
+void ResTreeNode::IndexErasing(EntryList::iterator entry) {
     const auto at = index_->find(std::u16string_view(entry->name_));
     if (at == index_->end() || at->second != entry)
         return;

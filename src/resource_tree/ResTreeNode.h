@@ -3,6 +3,7 @@
 
 #include "kern/Collate.h"
 #include "kern/StringBase.h"
+#include "resource_tree/BlockPool.h"
 #include "resource_tree/LoaderSettings.h"
 #include "resource_tree/ResTreeNodeChangeObserver.h"
 
@@ -68,11 +69,16 @@ struct EntryNameLess {
     bool operator()(std::u16string_view a, const ResTreeEntry& b) const noexcept;
 };
 
+// The entry containers of ordered and sorted nodes. Their elements come from a block pool: a
+// load makes one for nearly every element of a document.
+using EntryList = std::list<ResTreeEntry, PoolAllocator<ResTreeEntry>>;
+using EntrySet = std::set<ResTreeEntry, EntryNameLess, PoolAllocator<ResTreeEntry>>;
+
 // A position among a node's entries; equal to the node's End() when it names no entry.
 class ResTreePosition {
 public:
-    using ListIt = std::list<ResTreeEntry>::iterator;
-    using SetIt = std::set<ResTreeEntry, EntryNameLess>::iterator;
+    using ListIt = EntryList::iterator;
+    using SetIt = EntrySet::iterator;
 
     ResTreePosition() = default;
     explicit ResTreePosition(ListIt it) : ordered_(true), list_(it) {}
@@ -254,12 +260,11 @@ private:
     bool IsWatching(const ResTreeNode& other) const noexcept;
     Position InsertEntry(Position position, WString&& name, EntryKind kind, bool& inserted);
     void EraseEntry(Position position) noexcept;
-    void IndexInserted(std::list<ResTreeEntry>::iterator entry, bool atEnd);
-    void IndexErasing(std::list<ResTreeEntry>::iterator entry);
+    void IndexInserted(EntryList::iterator entry, bool atEnd);
+    void IndexErasing(EntryList::iterator entry);
     // The first entry of each name in a large ordered node; without it every lookup, and so
     // every element loaded into a long list, scans the list.
-    using NameIndex =
-        std::map<std::u16string_view, std::list<ResTreeEntry>::iterator, qv::kern::LessNoCase>;
+    using NameIndex = std::map<std::u16string_view, EntryList::iterator, qv::kern::LessNoCase>;
 
     WString name_;
     WString type_;
@@ -269,8 +274,8 @@ private:
     int32_t deferDepth_ = 0;
     uint32_t useCount_ = 0;
     ResTreeNode* parent_;
-    mutable std::list<ResTreeEntry> list_;
-    mutable std::set<ResTreeEntry, EntryNameLess> set_;
+    mutable EntryList list_;
+    mutable EntrySet set_;
     std::unique_ptr<Observers> observers_;
     mutable std::unique_ptr<NameIndex> index_;
 };
