@@ -192,12 +192,7 @@ bool ResTreeNode::SetTextAt(Position position, WString text) {
     if (position == End() || !IsTextKind(position->Kind()))
         return false;
     position->text_ = std::move(text);
-    RaiseChanges(kValueChanged);
-    if (qv::kern::EqualsNoCase(position->Name(), kDisplayName)) {
-        RaiseChanges(kDisplayNameChanged);
-        if (parent_ != nullptr)
-            parent_->RaiseChanges(kChildDisplayNameChanged);
-    }
+    RaiseValueChanged(*position);
     return true;
 }
 
@@ -205,13 +200,18 @@ bool ResTreeNode::AppendTextAt(Position position, std::u16string_view text) {
     if (position == End() || !IsTextKind(position->Kind()))
         return false;
     position->text_ += text;
+    RaiseValueChanged(*position);
+    return true;
+}
+
+void ResTreeNode::RaiseValueChanged(const ResTreeEntry& entry) {
     RaiseChanges(kValueChanged);
-    if (qv::kern::EqualsNoCase(position->Name(), kDisplayName)) {
+    // The display name is what the parent shows for this node, so the parent hears of it too.
+    if (qv::kern::EqualsNoCase(entry.Name(), kDisplayName)) {
         RaiseChanges(kDisplayNameChanged);
         if (parent_ != nullptr)
             parent_->RaiseChanges(kChildDisplayNameChanged);
     }
-    return true;
 }
 
 bool ResTreeNode::SetText(std::u16string_view name, WString text) {

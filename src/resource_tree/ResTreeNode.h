@@ -260,6 +260,8 @@ private:
     bool IsWatching(const ResTreeNode& other) const noexcept;
     Position InsertEntry(Position position, WString&& name, EntryKind kind, bool& inserted);
     void EraseEntry(Position position) noexcept;
+    // Raises the changes of a new value in the text entry ENTRY of this node.
+    void RaiseValueChanged(const ResTreeEntry& entry);
     void IndexInserted(EntryList::iterator entry, bool atEnd);
     void IndexErasing(EntryList::iterator entry);
     // The first entry of each name in a large ordered node; without it every lookup, and so
