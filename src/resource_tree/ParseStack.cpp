@@ -81,21 +81,11 @@ void ParseStack::Pop() noexcept {
     --depth_;
 }
 
-void ParseStack::OpenPending(Frame& frame) noexcept {
+void ParseStack::SetPending(Frame& frame, const char* name, const char** attributes) {
     frame.hasPending = true;
     frame.text.clear();
     frame.pendingNames.clear();
     frame.linkChildrenReported = false;
-}
-
-void ParseStack::SetPending(Frame& frame, const std::u16string& name, const XmlAttributes& atts) {
-    OpenPending(frame);
-    frame.pendingName = name;
-    frame.pendingAttributes = atts;
-}
-
-void ParseStack::SetPendingUtf8(Frame& frame, const char* name, const char** attributes) {
-    OpenPending(frame);
     frame.pendingName.clear();
     AppendUtf8AsUtf16(name, frame.pendingName);
     frame.pendingAttributes.clear();
@@ -114,25 +104,18 @@ ParseStack::Frame* ParseStack::FrameForStart() {
     return ProcessPending(frame, true);
 }
 
-void ParseStack::StartElement(const std::u16string& name, const XmlAttributes& attributes) {
+// Expat's events reach this handler only through the UTF-8 hooks below, which keep names and
+// texts in the frames' own buffers; the wide events of the adapter are never called.
+void ParseStack::StartElement(const std::u16string&, const XmlAttributes&) {}
+void ParseStack::EndElement(const std::u16string&) {}
+void ParseStack::CharacterData(std::u16string_view) {}
+
+void ParseStack::StartElementUtf8(const char* name, const char** attributes) {
     if (Frame* target = FrameForStart())
         SetPending(*target, name, attributes);
 }
 
-void ParseStack::StartElementUtf8(const char* name, const char** attributes) {
-    if (Frame* target = FrameForStart())
-        SetPendingUtf8(*target, name, attributes);
-}
-
-void ParseStack::EndElement(const std::u16string& name) {
-    FinishElement(nullptr, &name);
-}
-
 void ParseStack::EndElementUtf8(const char* name) {
-    FinishElement(name, nullptr);
-}
-
-void ParseStack::FinishElement(const char* utf8, const std::u16string* wide) {
     Frame& frame = Top();
     if (frame.ignoreDepth > 0) {
         --frame.ignoreDepth;
@@ -144,10 +127,7 @@ void ParseStack::FinishElement(const char* utf8, const std::u16string* wide) {
     if (frame.capturing) {
         if (frame.captureDepth >= 2) {
             std::u16string closing = u"</";
-            if (wide != nullptr)
-                closing += *wide;
-            else
-                AppendUtf8AsUtf16(utf8, closing);
+            AppendUtf8AsUtf16(name, closing);
             closing += u">";
             frame.node->AppendTextAt(frame.position, closing);
             --frame.captureDepth;
@@ -165,12 +145,6 @@ void ParseStack::FinishElement(const char* utf8, const std::u16string* wide) {
 
 // Text counts only inside a pending element: what stands between elements (mostly line breaks
 // and indentation) would be dropped when the next element starts, so it is not gathered.
-void ParseStack::CharacterData(std::u16string_view text) {
-    Frame& frame = Top();
-    if (frame.hasPending && frame.ignoreDepth == 0)
-        frame.text += text;
-}
-
 void ParseStack::CharacterDataUtf8(std::string_view text) {
     Frame& frame = Top();
     if (frame.hasPending && frame.ignoreDepth == 0)

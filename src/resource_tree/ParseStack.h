@@ -21,17 +21,17 @@ public:
     ParseStack(ResTreeNode& node, bool asChild, LoadContext& context, std::u16string filePath);
     ~ParseStack() override;
 
-    void StartElement(const std::u16string& name, const XmlAttributes& attributes) override;
-    void EndElement(const std::u16string& name) override;
-    void CharacterData(std::u16string_view text) override;
-
     // The node the document element became (null until then).
     ResTreeNode* DocumentRoot() const noexcept;
     // Appends MESSAGE to NODE's "XMLParseErrors" with the parser's line, column and context.
     void AddError(ResTreeNode& node, std::u16string_view message);
 
 protected:
-    // Names, attributes and texts go from Expat's UTF-8 straight into the frame that keeps them.
+    // Names, attributes and texts go from Expat's UTF-8 straight into the frame that keeps them;
+    // the wide events are not used.
+    void StartElement(const std::u16string& name, const XmlAttributes& attributes) override;
+    void EndElement(const std::u16string& name) override;
+    void CharacterData(std::u16string_view text) override;
     void StartElementUtf8(const char* name, const char** attributes) override;
     void EndElementUtf8(const char* name) override;
     void CharacterDataUtf8(std::string_view text) override;
@@ -74,14 +74,11 @@ private:
     Frame& Top() noexcept { return *frames_[depth_ - 1]; }
     Frame& Push(ResTreeNode& node, const Frame& enclosing, bool overwrite);
     void Pop() noexcept;
-    static void SetPending(Frame& frame, const std::u16string& name, const XmlAttributes& atts);
-    static void SetPendingUtf8(Frame& frame, const char* name, const char** attributes);
-    static void OpenPending(Frame& frame) noexcept;
+    // Makes the element NAME with ATTRIBUTES (Expat's UTF-8) the pending element of FRAME.
+    static void SetPending(Frame& frame, const char* name, const char** attributes);
     // The frame in which a starting element becomes pending (after the pending element there is
     // processed as a container); null when the element is to be ignored.
     Frame* FrameForStart();
-    // The end of an element; its name (UTF8 or WIDE, one of them) is only needed by a capture.
-    void FinishElement(const char* utf8, const std::u16string* wide);
     Steering ReadSteering(const XmlAttributes& attributes);
     ResTreeNode* OuterDocumentRoot() const noexcept { return frames_[0]->documentRoot; }
 
