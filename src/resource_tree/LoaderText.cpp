@@ -8,6 +8,7 @@
 
 #include <algorithm>
 #include <array>
+#include <unicode/utf8.h>
 #include <unistd.h>
 
 namespace wbhw {
@@ -113,30 +114,6 @@ size_t NarrowAscii(std::u16string_view from, char* to) noexcept {
     for (size_t i = 0; i < ascii; ++i)
         to[i] = static_cast<char>(units[i]);
     return ascii;
-}
-
-// Writes the UTF-8 bytes of C at TO; answers how many.
-size_t WriteUtf8(char32_t c, char* to) noexcept {
-    if (c < 0x80) {
-        to[0] = static_cast<char>(c);
-        return 1;
-    }
-    if (c < 0x800) {
-        to[0] = static_cast<char>(0xC0 | (c >> 6));
-        to[1] = static_cast<char>(0x80 | (c & 0x3F));
-        return 2;
-    }
-    if (c < 0x10000) {
-        to[0] = static_cast<char>(0xE0 | (c >> 12));
-        to[1] = static_cast<char>(0x80 | ((c >> 6) & 0x3F));
-        to[2] = static_cast<char>(0x80 | (c & 0x3F));
-        return 3;
-    }
-    to[0] = static_cast<char>(0xF0 | (c >> 18));
-    to[1] = static_cast<char>(0x80 | ((c >> 12) & 0x3F));
-    to[2] = static_cast<char>(0x80 | ((c >> 6) & 0x3F));
-    to[3] = static_cast<char>(0x80 | (c & 0x3F));
-    return 4;
 }
 
 } // namespace
@@ -302,7 +279,7 @@ std::string ToUtf8(std::u16string_view text) {
             const size_t needed = used + 4 + (i < end ? end - i : 0);
             if (needed > out.size())
                 out.resize(std::max(needed, out.size() + out.size() / 2));
-            used += WriteUtf8(code, out.data() + used);
+            U8_APPEND_UNSAFE(out.data(), used, code);
         }
         out.resize(used);
     }
