@@ -5,6 +5,7 @@
 #include "cli/HostedModule.h"
 #include "host/binding/runtime_api.h"
 #include "kern/CodePage.h"
+#include "project/HexStatus.h"
 #include "resources/ResourceService.h"
 
 #include <cstdint>

@@ -4,8 +4,6 @@
 #include "runtime/Runtime.h"
 
 #include <cstring>
-#include <iomanip>
-#include <sstream>
 #include <unicode/unistr.h>
 
 namespace wbhost::cli {
@@ -21,12 +19,6 @@ std::string ToUtf8(std::u16string_view text) {
     std::string encoded;
     wide.toUTF8String(encoded);
     return encoded;
-}
-
-std::string HexStatus(int32_t status) {
-    std::ostringstream text;
-    text << "0x" << std::hex << std::setw(8) << std::setfill('0') << static_cast<uint32_t>(status);
-    return text.str();
 }
 
 void HandleDisposer::operator()(void** handle) const noexcept {

@@ -16,9 +16,6 @@ std::u16string FromUtf8(std::string_view text);
 // UTF-16 to UTF-8; unpaired surrogates become U+FFFD.
 std::string ToUtf8(std::u16string_view text);
 
-// STATUS as eight hex digits after "0x", as statuses are written in messages.
-std::string HexStatus(int32_t status);
-
 // Gives a handle back to the host (a null handle is ignored by the host).
 struct HandleDisposer {
     void operator()(void** handle) const noexcept;

@@ -7,6 +7,7 @@
 #include "host/contracts/IwbProgram.h"
 #include "host/contracts/IwbProgramRunner.h"
 #include "host/contracts/IwbProgramRunnerService.h"
+#include "project/HexStatus.h"
 
 #include <filesystem>
 #include <ostream>

@@ -5,6 +5,7 @@
 #include "cli/HostText.h"
 #include "cli/ItemListing.h"
 #include "kern/Collate.h"
+#include "project/HexStatus.h"
 #include "provider/TIOIdentifiers.h"
 
 #include <filesystem>

@@ -4,10 +4,10 @@
 #include "kern/Guid.h"
 #include "kern/Utf8.h"
 #include "project/AtomicFile.h"
+#include "project/HexStatus.h"
 #include "project/ItemUIMap.h"
 
 #include <algorithm>
-#include <cstdio>
 #include <functional>
 
 namespace wbhost::project {
@@ -18,12 +18,6 @@ namespace {
 void SetError(std::string* error, std::string message) {
     if (error != nullptr)
         *error = std::move(message);
-}
-
-std::string HexStatus(HRESULT hr) {
-    char text[16];
-    std::snprintf(text, sizeof text, "0x%08X", static_cast<unsigned>(hr));
-    return text;
 }
 } // namespace
 

@@ -3,11 +3,11 @@
 
 #include "cli/HostedModule.h"
 #include "host/contracts/IwbProjectProvider.h"
+#include "project/HexStatus.h"
 #include "project/ProviderFactory.h"
 #include "session/ProjectLookups.h"
 #include "session/RootObject.h"
 
-#include <cstdio>
 #include <new>
 
 namespace wbhost::session {
@@ -22,12 +22,6 @@ bool Fail(std::string* error, std::string message) {
     if (error != nullptr)
         *error = std::move(message);
     return false;
-}
-
-std::string HexStatus(HRESULT hr) {
-    char text[16];
-    std::snprintf(text, sizeof text, "0x%08X", static_cast<unsigned>(hr));
-    return text;
 }
 
 // The runtime has one resolver for the process; only the session that set it clears it, so
@@ -79,12 +73,7 @@ bool HostSession::Open(const std::string& modulePath, std::string* error) {
         return true;
     // A project opened before the module: the provider makes its items from now on.
     project_->SetObjectFactory(project::ProviderFactory(provider_));
-    if (const auto attachable = provider_.As<IwbProjectProvider>()) {
-        if (const HRESULT hr = project_->AttachProvider(attachable, false); FAILED(hr))
-            return Fail(error, "the provider refused the project (status " + HexStatus(hr) + ")");
-        attachable->ProjectReady();
-    }
-    return true;
+    return AttachProvider(false, error);
 }
 
 bool HostSession::NewProject(std::u16string name, std::string* error) {
@@ -115,13 +104,18 @@ bool HostSession::Attach(std::unique_ptr<project::Project> project, bool reloade
                          std::string* error) {
     project_ = std::move(project);
     Wire();
+    if (AttachProvider(reloaded, error))
+        return true;
+    Close();
+    return false;
+}
+
+bool HostSession::AttachProvider(bool reloaded, std::string* error) {
     const auto attachable = provider_.As<IwbProjectProvider>();
     if (!attachable)
         return true;
-    if (const HRESULT hr = project_->AttachProvider(attachable, reloaded); FAILED(hr)) {
-        Close();
+    if (const HRESULT hr = project_->AttachProvider(attachable, reloaded); FAILED(hr))
         return Fail(error, "the provider refused the project (status " + HexStatus(hr) + ")");
-    }
     attachable->ProjectReady();
     return true;
 }

@@ -68,6 +68,9 @@ public:
 
 private:
     bool Attach(std::unique_ptr<project::Project> project, bool reloaded, std::string* error);
+    // Attaches the provider, if it takes projects, to the open project and tells it the project
+    // is ready; false with a message in ERROR when it refuses.
+    bool AttachProvider(bool reloaded, std::string* error);
     void Wire();
     void Unwire();
 
