@@ -24,6 +24,14 @@ bool IsDigits(std::u16string_view text) noexcept {
     return true;
 }
 
+// True when the "document-root" VALUE just put in ends in "/" and TEXT goes on, at AFTER, with
+// the separator of a path below it.
+bool IsRootPathJoin(std::u16string_view name, std::u16string_view value, std::u16string_view text,
+                    size_t after) noexcept {
+    return qv::kern::EqualsNoCase(name, u"document-root") && !value.empty() &&
+           value.back() == u'/' && after < text.size() && text[after] == u'/';
+}
+
 // Decimal digits as a number; values beyond 64 bits stay at the largest value, which no range
 // can reach anyway since expansion is capped.
 uint64_t ParseDecimal(std::u16string_view digits) noexcept {
@@ -179,6 +187,10 @@ bool SubstituteVariables(std::u16string& text, const VariableMap& variables) {
             out.append(text, at, close + 1 - at);
         }
         at = close + 1;
+        // The document root's path is "/" when the document is the tree's root: followed by the
+        // usual separator it would give "//a", whose empty piece resolves to nothing.
+        if (found != variables.end() && IsRootPathJoin(found->first, found->second, text, at))
+            ++at;
     }
     if (changed)
         text = std::move(out);

@@ -249,9 +249,13 @@ private:
         std::vector<Registration> registrations;
         std::vector<ResTreeNode*> watching; // nodes this node is registered with
         std::vector<ResTreeNode*> watchers; // nodes registered with this node
+        uint64_t pass = 0;                  // the delivery pass running on this node, 0 if none
     };
 
     void OnNodeChanged(ResTreeNode* node, uint32_t changes, uint32_t cookie) override;
+    // NotifyChanges; the first pass carries the identity INHERITED when it is not 0 (a change
+    // forwarded from a pass being delivered), every other pass a fresh one.
+    void Deliver(uint32_t mask, uint64_t inherited);
     Observers& EnsureObservers();
     bool HasActiveRegistration(uint32_t bit) const noexcept;
     void Watch(ResTreeNode& other);

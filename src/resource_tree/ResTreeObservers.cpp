@@ -13,6 +13,27 @@ constexpr uint32_t kWatchCookie = 1;
 // What a node asks of the nodes it watches: the bits it forwards.
 constexpr uint32_t kForwardedChanges = kDisplayNameChanged | kAncestorChanged | kReservationChanged;
 
+// The pass whose observers are being called on this thread (0 outside any delivery), and the
+// last identity handed out. A change forwarded by a watching node carries the pass it came with,
+// so a node can tell its own delivery coming back round a ring of watchers from a change that
+// somebody made while it was delivering.
+thread_local uint64_t tDeliveringPass = 0;
+thread_local uint64_t tLastPass = 0;
+
+// Makes PASS the delivering pass for the life of the object, then puts the previous one back.
+class DeliveringPass {
+public:
+    explicit DeliveringPass(uint64_t pass) noexcept : previous_(tDeliveringPass) {
+        tDeliveringPass = pass;
+    }
+    ~DeliveringPass() { tDeliveringPass = previous_; }
+    DeliveringPass(const DeliveringPass&) = delete;
+    DeliveringPass& operator=(const DeliveringPass&) = delete;
+
+private:
+    uint64_t previous_;
+};
+
 } // namespace
 
 ResTreeNode::Observers& ResTreeNode::EnsureObservers() {
@@ -35,6 +56,10 @@ void ResTreeNode::EndDeferral() {
 }
 
 void ResTreeNode::NotifyChanges(uint32_t mask) {
+    Deliver(mask, 0);
+}
+
+void ResTreeNode::Deliver(uint32_t mask, uint64_t inherited) {
     // Nobody listens: what would be delivered is simply dropped, as a pass would do.
     if (!observers_ || observers_->registrations.empty()) {
         pendingChanges_ &= ~mask;
@@ -47,7 +72,10 @@ void ResTreeNode::NotifyChanges(uint32_t mask) {
         deferDepth_ = 1;
         pendingChanges_ = 0;
         const uint32_t due = remembered & mask;
+        observers_->pass = inherited != 0 ? inherited : ++tLastPass;
+        inherited = 0;
         if (due != 0) {
+            const DeliveringPass delivering(observers_->pass);
             auto& list = observers_->registrations;
             // Observers may add registrations while being called; indices survive that.
             for (size_t i = 0; i < list.size(); ++i) {
@@ -61,6 +89,7 @@ void ResTreeNode::NotifyChanges(uint32_t mask) {
         }
         pendingChanges_ |= remembered & ~mask;
         notifying_ = false;
+        observers_->pass = 0;
         deferDepth_ = rememberedDepth != 0 ? 1 : 0;
         if (rememberedDepth != 0 || (pendingChanges_ & mask) == 0)
             return;
@@ -69,14 +98,17 @@ void ResTreeNode::NotifyChanges(uint32_t mask) {
 
 void ResTreeNode::OnNodeChanged(ResTreeNode* /*node*/, uint32_t changes, uint32_t /*cookie*/) {
     const uint32_t forwarded = changes & kForwardedChanges;
-    // While this node delivers, what comes back from the nodes it delivers to is its own change
-    // echoed through a ring of watchers (a node reserving its ancestor, or two nodes reserving
-    // each other); taking it would start another pass, and so on for ever.
-    if (forwarded == 0 || notifying_)
+    if (forwarded == 0)
+        return;
+    // A change of this node's own pass, arriving while it delivers, is that delivery echoed
+    // through a ring of watchers (a node reserving its ancestor, two nodes reserving each
+    // other): taking it would start another pass, and so on for ever. Any other change that
+    // arrives meanwhile (say an observer renamed an ancestor) goes out in a further pass.
+    if (notifying_ && observers_->pass == tDeliveringPass)
         return;
     pendingChanges_ |= forwarded;
     if (deferDepth_ == 0)
-        NotifyChanges(kAllChanges);
+        Deliver(kAllChanges, tDeliveringPass);
 }
 
 bool ResTreeNode::HasActiveRegistration(uint32_t bit) const noexcept {

@@ -34,6 +34,21 @@ TEST(ParseElement, LinksStoreThePathFromTheirNodeOrSayUnresolved) {
     EXPECT_EQ(root->ResolvePath(u"fromRoot"), ChildOf(*ChildOf(*root, u"a"), u"pin"));
 }
 
+TEST(ParseElement, DocumentRootAnchorsJoinOnceWhenTheDocumentIsTheTreeRoot) {
+    // The root's own path is "/"; "#{document-root}/a" must not become "//a", which names nothing.
+    auto root = Load(uR"(<Top>
+        <Group name="a"/><Group name="b"/>
+        <Group name="user"><Reserves>#{document-root}/a, #{document-root}/b</Reserves>
+            <Self>#{document-root}</Self></Group>
+    </Top>)");
+    ResTreeNode* user = ChildOf(*root, u"user");
+    ASSERT_NE(user, nullptr);
+    EXPECT_EQ(TextOf(*user, u"Reserves"), u"../a,../b"); // rewritten from the node, as loaded
+    EXPECT_EQ(TextOf(*user, u"Self"), u"/");
+    EXPECT_EQ(user->ReservedNodes(true),
+              (std::vector<ResTreeNode*>{ChildOf(*root, u"a"), ChildOf(*root, u"b")}));
+}
+
 TEST(ParseElement, ALinkWithMarkupInsideKeepsTheDocumentWhole) {
     auto root = Load(uR"(<Top>
         <Group name="a"/>
