@@ -76,10 +76,13 @@ void AddProject(CLI::App& app, Request& request) {
 
     auto* list = project->add_subcommand(
         "list", "print the project's items: type, name, identifier, attribute set, status");
+    auto json = std::make_shared<bool>(false);
     list->add_option("PROJECT", *path, "the project file")->required();
-    list->callback([&request, path] {
-        request.run = [&request, path] {
-            return wbhost::cli::RunProjectList(request.host, *path, std::cout, std::cerr);
+    list->add_flag("--json", *json, "print the targets' Tangent I/O items and their state as JSON");
+    list->callback([&request, path, json] {
+        request.run = [&request, path, json] {
+            return *json ? wbhost::cli::RunProjectJson(request.host, *path, std::cout, std::cerr)
+                         : wbhost::cli::RunProjectList(request.host, *path, std::cout, std::cerr);
         };
     });
 
@@ -102,11 +105,13 @@ void AddProject(CLI::App& app, Request& request) {
 
 void AddEdit(CLI::App& app, Request& request) {
     auto* edit = app.add_subcommand(
-        "edit", "change a target's resource tree (rename, remove, insert), show what its items "
-                "now say, and save");
+        "edit", "change a target's resource tree (rename, remove, insert, set or remove an "
+                "attribute), show what its items now say, and save");
     edit->footer("  edit PROJECT TARGET rename NODE NEWNAME\n"
                  "  edit PROJECT TARGET remove NODE\n"
                  "  edit PROJECT TARGET insert PARENT DOCUMENT.xml   (PARENT / is the root)\n"
+                 "  edit PROJECT TARGET set-attribute NODE NAME VALUE\n"
+                 "  edit PROJECT TARGET remove-attribute NODE NAME\n"
                  "NODE and PARENT are paths in the target's tree, such as Connector0/DIO3. The "
                  "changed tree is kept beside the project as PROJECT.TARGET.xml; the original "
                  "description is never rewritten.");
@@ -116,10 +121,11 @@ void AddEdit(CLI::App& app, Request& request) {
     auto arguments = std::make_shared<std::vector<std::string>>();
     edit->add_option("PROJECT", *path, "the project file")->required();
     edit->add_option("TARGET", edits->target, "the target's name")->required();
-    edit->add_option("ACTION", *action, "rename, remove or insert")
+    edit->add_option("ACTION", *action, "what to change")
         ->required()
-        ->check(CLI::IsMember({"rename", "remove", "insert"}));
-    edit->add_option("ARGS", *arguments, "the node, then the new name or the document file");
+        ->check(CLI::IsMember({"rename", "remove", "insert", "set-attribute", "remove-attribute"}));
+    edit->add_option("ARGS", *arguments,
+                     "the node, then the new name, the document file or the attribute");
     edit->callback([&request, path, edits, action, arguments] {
         std::string error;
         if (!wbhost::cli::ParseEdit(*action, *arguments, *edits, error))

@@ -4,6 +4,8 @@
 #include "cli/EditCommands.h"
 #include "cli/ProjectCommands.h"
 
+#include <nlohmann/json.hpp>
+
 using clitest::Options;
 using clitest::ScratchProject;
 using clitest::Slurp;
@@ -26,7 +28,7 @@ protected:
             << p.err.str();
     }
     int Edit(const std::string& action, const std::vector<std::string>& arguments) {
-        EditRequest request{"T", EditKind::Rename, "", ""};
+        EditRequest request{"T", EditKind::Rename, "", "", ""};
         std::string error;
         if (!ParseEdit(action, arguments, request, error)) {
             p.err << error;
@@ -59,6 +61,11 @@ TEST(CliEditParse, EachActionTakesItsOwnArguments) {
     EXPECT_EQ(request.argument, "");
     ASSERT_TRUE(ParseEdit("insert", {"/", "part.xml"}, request, error));
     EXPECT_EQ(request.kind, EditKind::Insert);
+    ASSERT_TRUE(ParseEdit("set-attribute", {"A", "N", "V"}, request, error));
+    EXPECT_EQ(request.kind, EditKind::SetAttribute);
+    EXPECT_EQ(request.value, "V");
+    EXPECT_FALSE(ParseEdit("remove-attribute", {"A"}, request, error));
+    EXPECT_NE(error.find("remove-attribute NODE NAME"), std::string::npos);
     EXPECT_FALSE(ParseEdit("rename", {"A"}, request, error));
     EXPECT_NE(error.find("rename NODE NEWNAME"), std::string::npos);
     EXPECT_FALSE(ParseEdit("remove", {"A", "B"}, request, error));
@@ -96,6 +103,42 @@ TEST_F(CliEdit, EditsReachTheReopenedProjectAndNeverTheOriginalDescription) {
         << p.err.str();
 }
 
+TEST_F(CliEdit, AttributeEditsAreKeptAndTheItemsStateIsListed) {
+    ASSERT_EQ(p.Run([&](std::ostream& out, std::ostream& err) {
+        return RunAddItem(Options(), p.path, {"T", "AI0", "Sensors/Level"}, out, err);
+    }),
+              kProjectOk)
+        << p.err.str();
+    ASSERT_EQ(Edit("set-attribute", {"DIO0", "HiddenTIO", "TRUE"}), 0) << p.err.str();
+    EXPECT_NE(p.out.str().find("set HiddenTIO=\"TRUE\" on /DIO0"), std::string::npos);
+    // Every edit ends with what each item reports, folders in its path.
+    EXPECT_NE(p.out.str().find("  Sensors/Level: "), std::string::npos) << p.out.str();
+    ASSERT_EQ(Edit("set-attribute", {"DIO0", "Note", "a & b <c>"}), 0) << p.err.str();
+    EXPECT_NE(KeptNode("DIO0").find("<HiddenTIO>TRUE</HiddenTIO>"), std::string::npos);
+    ASSERT_EQ(Edit("remove-attribute", {"DIO0", "hiddentio"}), 0) << p.err.str();
+    const std::string node = KeptNode("DIO0");
+    EXPECT_EQ(node.find("HiddenTIO"), std::string::npos) << node;
+    EXPECT_NE(node.find("<Note>a &amp; b &lt;c&gt;</Note>"), std::string::npos) << node;
+
+    ASSERT_EQ(p.Run([&](std::ostream& out, std::ostream& err) {
+        return RunProjectJson(Options(), p.path, out, err);
+    }),
+              kProjectOk)
+        << p.err.str();
+    const auto listing = nlohmann::json::parse(p.out.str());
+    ASSERT_EQ(listing["targets"].size(), 1u);
+    const auto& items = listing["targets"][0]["items"];
+    ASSERT_EQ(items.size(), 2u) << listing.dump(2);
+    EXPECT_EQ(items[0]["path"], "Valve");
+    EXPECT_EQ(items[1]["path"], "Sensors/Level");
+    EXPECT_EQ(items[1]["id"].get<std::string>().size(), 38u);
+    for (const auto& item : items) {
+        for (const char* field :
+             {"resource", "status", "statusText", "hidden", "featureSetVersion"})
+            EXPECT_TRUE(item.contains(field)) << field;
+    }
+}
+
 TEST_F(CliEdit, RefusedEditsChangeNoFile) {
     const std::string saved = Slurp(p.path);
     const std::string broken = p.scratch.Write("broken.xml", "<Line name=\"X\"><Oops></Line>");
@@ -112,6 +155,9 @@ TEST_F(CliEdit, RefusedEditsChangeNoFile) {
         {"insert", {"DIO9", broken}, "no node"},
         {"insert", {"/", broken}, "does not load"},
         {"insert", {"/", p.scratch.File("missing.xml")}, "cannot read"},
+        {"remove-attribute", {"DIO0", "Nothing"}, "has no attribute \"Nothing\""},
+        {"set-attribute", {"/", "DIO0", "x"}, "not an attribute"},
+        {"set-attribute", {"DIO9", "A", "x"}, "no node"},
     };
     for (const auto& each : refusals) {
         EXPECT_EQ(Edit(each.action, each.arguments), 1) << each.says;
@@ -119,7 +165,7 @@ TEST_F(CliEdit, RefusedEditsChangeNoFile) {
         EXPECT_EQ(Slurp(p.path), saved) << each.says;
         EXPECT_FALSE(std::filesystem::exists(EditedDescriptionPath(p.path, u"T"))) << each.says;
     }
-    EditRequest request{"U", EditKind::Remove, "AI0", ""};
+    EditRequest request{"U", EditKind::Remove, "AI0", "", ""};
     EXPECT_EQ(RunEdit(Options(), p.path, request, p.out, p.err), 1);
 }
 

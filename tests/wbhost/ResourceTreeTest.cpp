@@ -121,7 +121,7 @@ TEST_F(ResourceTreeTest, InsertAddsTheDocumentBelowAndTellsTheParent) {
     EXPECT_TRUE(observer->heard.empty());
 }
 
-TEST_F(ResourceTreeTest, PropertiesRaiseAddedChangedAndDisplayNameBits) {
+TEST_F(ResourceTreeTest, PropertiesRaiseAddedChangedRemovedAndDisplayNameBits) {
     auto observer = test::NewObserver();
     Watch(observer.Get(), {u"C0", u"C0/DIO1"});
     const auto line = Object(u"C0/DIO1");
@@ -147,6 +147,17 @@ TEST_F(ResourceTreeTest, PropertiesRaiseAddedChangedAndDisplayNameBits) {
     SysFreeString(value);
     EXPECT_EQ(line->GetAttribute(u"Missing", &value), S_FALSE);
     EXPECT_EQ(value, nullptr);
+
+    // Removal: the value bit, and for the display name the same bits as setting it.
+    observer->heard.clear();
+    EXPECT_EQ(tree_->RemoveAttribute(At(u"C0/DIO1"), u"note"), S_OK);
+    EXPECT_EQ(tree_->RemoveAttribute(At(u"C0/DIO1"), u"displayname"), S_OK);
+    EXPECT_EQ(tree_->RemoveAttribute(At(u"C0/DIO1"), u"Note"), S_FALSE);
+    EXPECT_EQ(tree_->RemoveAttribute(At(u"C0"), u"DIO1"), S_FALSE); // a child stays
+    EXPECT_EQ(observer->heard,
+              (std::vector<Heard>{
+                  {u"/C0/DIO1", 0x10, 7}, {u"/C0/DIO1", 0x10 | 0x2, 7}, {u"/C0", 0x200, 7}}));
+    EXPECT_EQ(line->GetAttribute(u"Note", &value), S_FALSE);
 }
 
 TEST_F(ResourceTreeTest, MasksKindsAndSilencingDecideWhoHears) {

@@ -219,7 +219,7 @@ void PlayEdits(Transcript& script, const HostOptions& options, const WorkFolder&
         for (const std::string& argument : arguments)
             command += " " + argument;
         script.Step(title, command, expect, [&](std::ostream& out, std::ostream& err) {
-            EditRequest request{"K40", EditKind::Rename, "", ""};
+            EditRequest request{"K40", EditKind::Rename, "", "", ""};
             std::string error;
             if (!ParseEdit(action, arguments, request, error)) {
                 err << error << "\n";

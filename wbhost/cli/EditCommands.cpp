@@ -3,6 +3,7 @@
 
 #include "cli/HostText.h"
 #include "cli/ItemListing.h"
+#include "cli/ItemStates.h"
 #include "project/AtomicFile.h"
 #include "resource_tree/ResTreeWriter.h"
 
@@ -15,6 +16,29 @@ namespace {
 
 using project::ProjectItem;
 using wbhw::ResTreeNode;
+
+// Sets or removes the attribute (text entry) of NODE that REQUEST names; false with the reason
+// on ERR.
+bool ApplyAttributeEdit(resources::ResourceTree& tree, ResTreeNode& node,
+                        const EditRequest& request, std::ostream& out, std::ostream& err) {
+    const std::u16string name = FromUtf8(request.argument);
+    const std::string where = ToUtf8(node.Path());
+    if (request.kind == EditKind::SetAttribute) {
+        if (tree.SetAttribute(node, name, FromUtf8(request.value)) != S_OK) {
+            err << "wbhost: " << where << " has a child or link called \"" << request.argument
+                << "\", not an attribute\n";
+            return false;
+        }
+        out << "set " << request.argument << "=\"" << request.value << "\" on " << where << "\n";
+        return true;
+    }
+    if (tree.RemoveAttribute(node, name) != S_OK) {
+        err << "wbhost: " << where << " has no attribute \"" << request.argument << "\"\n";
+        return false;
+    }
+    out << "removed the attribute " << request.argument << " of " << where << "\n";
+    return true;
+}
 
 // Applies REQUEST to TREE and tells OUT what changed; false with the reason on ERR.
 bool ApplyEdit(resources::ResourceTree& tree, const EditRequest& request, std::ostream& out,
@@ -63,6 +87,9 @@ bool ApplyEdit(resources::ResourceTree& tree, const EditRequest& request, std::o
         out << "inserted " << request.argument << " under " << where << "\n";
         return true;
     }
+    case EditKind::SetAttribute:
+    case EditKind::RemoveAttribute:
+        return ApplyAttributeEdit(tree, *node, request, out, err);
     }
     return false;
 }
@@ -113,6 +140,8 @@ bool ParseEdit(const std::string& action, const std::vector<std::string>& argume
         {"rename", EditKind::Rename, 2, "rename NODE NEWNAME"},
         {"remove", EditKind::Remove, 1, "remove NODE"},
         {"insert", EditKind::Insert, 2, "insert PARENT DOCUMENT.xml"},
+        {"set-attribute", EditKind::SetAttribute, 3, "set-attribute NODE NAME VALUE"},
+        {"remove-attribute", EditKind::RemoveAttribute, 2, "remove-attribute NODE NAME"},
     };
     for (const Shape& shape : kShapes) {
         if (action != shape.action)
@@ -124,9 +153,11 @@ bool ParseEdit(const std::string& action, const std::vector<std::string>& argume
         request.kind = shape.kind;
         request.node = arguments[0];
         request.argument = shape.count > 1 ? arguments[1] : std::string();
+        request.value = shape.count > 2 ? arguments[2] : std::string();
         return true;
     }
-    error = "unknown edit \"" + action + "\" (rename, remove or insert)";
+    error = "unknown edit \"" + action +
+            "\" (rename, remove, insert, set-attribute or remove-attribute)";
     return false;
 }
 
@@ -169,6 +200,8 @@ int RunEdit(const HostOptions& options, const std::string& projectPath, const Ed
     }
     out << "items of target \"" << ToUtf8(target->Name()) << "\" now:\n";
     PrintItemTree(*target, out, 1);
+    out << "what they report:\n";
+    PrintItemStates(*target, out);
     FinishSession(options, session, out);
     return 0;
 }

@@ -10,18 +10,20 @@
 
 namespace wbhost::cli {
 
-enum class EditKind { Rename, Remove, Insert };
+enum class EditKind { Rename, Remove, Insert, SetAttribute, RemoveAttribute };
 
 struct EditRequest {
     std::string target; // the target's name
     EditKind kind = EditKind::Rename;
-    std::string node; // the node renamed or removed, or the one inserted under ("" or "/": root)
-    std::string argument; // the new name (rename) or the resource-tree document file (insert)
+    std::string node; // the node changed, or the one inserted under ("" or "/": root)
+    // The new name (rename), the resource-tree document file (insert) or the attribute's name.
+    std::string argument;
+    std::string value; // the attribute's new value (set-attribute)
 };
 
-// Fills REQUEST's kind and node from ACTION ("rename", "remove", "insert") and its ARGUMENTS
-// (rename NODE NEWNAME, remove NODE, insert PARENT FILE). False with the usage in ERROR when the
-// action is unknown or the count of arguments does not fit it.
+// Fills REQUEST from ACTION and its ARGUMENTS (rename NODE NEWNAME, remove NODE, insert PARENT
+// FILE, set-attribute NODE NAME VALUE, remove-attribute NODE NAME). False with the usage in
+// ERROR when the action is unknown or the count of arguments does not fit it.
 bool ParseEdit(const std::string& action, const std::vector<std::string>& arguments,
                EditRequest& request, std::string& error);
 
@@ -31,7 +33,7 @@ bool ParseEdit(const std::string& action, const std::vector<std::string>& argume
 // finds the tree its items followed; the original description is never rewritten. Fails,
 // leaving every file as it was, when the project or target cannot be found, the node does not
 // exist, the edit is refused (a sibling holds the new name, the root cannot be removed, the
-// document does not load) or a file cannot be written.
+// document does not load, the attribute is a child or is not there) or a file cannot be written.
 int RunEdit(const HostOptions& options, const std::string& projectPath, const EditRequest& request,
             std::ostream& out, std::ostream& err);
 

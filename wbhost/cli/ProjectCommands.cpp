@@ -4,6 +4,7 @@
 #include "cli/AttributeSet.h"
 #include "cli/HostText.h"
 #include "cli/ItemListing.h"
+#include "cli/ProjectJson.h"
 #include "kern/Collate.h"
 #include "project/HexStatus.h"
 #include "provider/TIOIdentifiers.h"
@@ -173,6 +174,17 @@ int RunProjectList(const HostOptions& options, const std::string& projectPath, s
         return kProjectFailed;
     PrintItemTree(session.Project()->Root(), out);
     FinishSession(options, session, out);
+    return kProjectOk;
+}
+
+int RunProjectJson(const HostOptions& options, const std::string& projectPath, std::ostream& out,
+                   std::ostream& err) {
+    session::HostSession session;
+    if (!StartProjectSession(options, session, projectPath, err))
+        return kProjectFailed;
+    WriteProjectJson(*session.Project(), out);
+    // The program runs go to the error stream here, so that OUT stays one JSON document.
+    FinishSession(options, session, err);
     return kProjectOk;
 }
 

@@ -26,6 +26,11 @@ int RunProjectNew(const HostOptions& options, const std::string& projectPath,
 int RunProjectList(const HostOptions& options, const std::string& projectPath, std::ostream& out,
                    std::ostream& err);
 
+// Opens PROJECTPATH and writes it to OUT as JSON (see WriteProjectJson); kProjectFailed when it
+// cannot be opened.
+int RunProjectJson(const HostOptions& options, const std::string& projectPath, std::ostream& out,
+                   std::ostream& err);
+
 // What `project add-item` asks for.
 struct AddItemRequest {
     std::string target;   // the target's name

@@ -74,6 +74,9 @@ public:
     // the parent). 1 when NAME is empty or names a child or link entry.
     HRESULT SetAttribute(wbhw::ResTreeNode& node, std::u16string_view name,
                          std::u16string_view value);
+    // Removes the text entry NAME (0x10; "DisplayName" also 0x2, and 0x200 on the parent). 1
+    // when NODE has no text entry of that name.
+    HRESULT RemoveAttribute(wbhw::ResTreeNode& node, std::u16string_view name);
     // Renames NODE (0x2 on it, 0x200 on its parent, 0x20 on every descendant). E_INVALIDARG for
     // an empty name or one that a sibling already has; the root is renamed too.
     HRESULT Rename(wbhw::ResTreeNode& node, std::u16string_view newName);
@@ -113,6 +116,9 @@ private:
     // bits in its mask.
     void Deliver(const std::shared_ptr<NodeState>& state, uint32_t events);
     void Run(const Plan& plan);
+    // Tells NODE's observers of EVENTS, a change of its text entry NAME ("DisplayName" also
+    // changes the display name, which NODE's parent hears of).
+    void RunAttributeChange(wbhw::ResTreeNode& node, std::u16string_view name, uint32_t events);
     // EVENTS for every observed node below NODE, parents before children.
     void PlanDescendants(wbhw::ResTreeNode& node, uint32_t events, Plan& plan);
     // 0x400 for NODE, then its descendants' own 0x400 and 0x1, then 0x1 for NODE.

@@ -67,12 +67,29 @@ HRESULT ResourceTree::SetAttribute(ResTreeNode& node, std::u16string_view name,
     } else {
         return S_FALSE; // a child or a link of that name: not a property
     }
+    RunAttributeChange(node, name, events);
+    return S_OK;
+}
+
+HRESULT ResourceTree::RemoveAttribute(ResTreeNode& node, std::u16string_view name) {
+    const std::lock_guard guard(mutex_);
+    const auto found = node.FindLoading(name);
+    if (found == node.End() || !wbhw::IsTextKind(found->Kind()))
+        return S_FALSE;
+    // The entry's own spelling: NAME may differ in case, and the plan reads it after removal.
+    const wbhw::WString removed = found->Name();
+    node.RemoveAt(found);
+    RunAttributeChange(node, removed, event::kValueRemoved);
+    return S_OK;
+}
+
+void ResourceTree::RunAttributeChange(ResTreeNode& node, std::u16string_view name,
+                                      uint32_t events) {
     const bool displayName = qv::kern::EqualsNoCase(name, kDisplayName);
     Plan plan{{Track(node), events | (displayName ? event::kDisplayName : 0)}};
     if (displayName && node.Parent() != nullptr)
         plan.emplace_back(Track(*node.Parent()), event::kChildDisplayName);
     Run(plan);
-    return S_OK;
 }
 
 HRESULT ResourceTree::Rename(ResTreeNode& node, std::u16string_view newName) {
