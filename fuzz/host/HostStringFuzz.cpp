@@ -2,7 +2,7 @@
 // element reads and writes, blocks with arbitrary counts. Every result is checked against a plain
 // model, and every host handle must be given back at the end.
 #include "host/HostStringArray.h"
-#include "kern/wb/WBErrorException.h"
+#include "host/errors/WBErrorException.h"
 #include "runtime/HandleTable.h"
 #include "runtime/Runtime.h"
 
@@ -46,7 +46,7 @@ void Check(bool condition) {
 template <class Action> bool Raises(Action action) {
     try {
         action();
-    } catch (const qv::kern::wb::WBErrorException&) {
+    } catch (const qv::host::errors::WBErrorException&) {
         return true;
     }
     return false;

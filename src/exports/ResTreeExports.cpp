@@ -1,7 +1,7 @@
 // The exported queries on host resource trees.
+#include "com/Bstr.h"
 #include "exports/Export.h"
 #include "exports/ResTreeFrame.h"
-#include "framework/com/Bstr.h"
 
 #include <cstdint>
 

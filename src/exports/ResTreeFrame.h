@@ -2,13 +2,13 @@
 // tree from the refnum, the node from the path, the "found" flag, and every failure as a status.
 #pragma once
 
-#include "framework/com/ComPtr.h"
+#include "com/ComPtr.h"
 #include "host/HostString.h"
 #include "host/binding/HostFunctions.h"
 #include "host/contracts/IwbhwResourceTreeAccess.h"
+#include "host/errors/HostErrorToHResult.h"
+#include "host/errors/WBErrorException.h"
 #include "kern/CodePage.h"
-#include "kern/wb/HostErrorToHResult.h"
-#include "kern/wb/WBErrorException.h"
 
 #include <cstdint>
 #include <new>
@@ -21,8 +21,8 @@ namespace qv::exports {
 template <class Body> int32_t AnswerStatus(Body&& body) noexcept {
     try {
         return body();
-    } catch (const kern::wb::WBErrorException& e) {
-        return kern::wb::HostErrorToHResult(e.code());
+    } catch (const host::errors::WBErrorException& e) {
+        return host::errors::HostErrorToHResult(e.code());
     } catch (const std::bad_alloc&) {
         return E_OUTOFMEMORY;
     } catch (...) {

@@ -2,8 +2,8 @@
 // from UTF-16, searched, measured and checked for forbidden characters.
 #include "exports/Export.h"
 #include "host/HostString.h"
+#include "host/errors/WBErrorException.h"
 #include "kern/CodePage.h"
-#include "kern/wb/WBErrorException.h"
 
 #include <cstdint>
 #include <memory>
@@ -21,7 +21,7 @@ using qv::host::HostString;
 template <class Body> int32_t AnswerHostError(Body&& body) noexcept {
     try {
         return body();
-    } catch (const qv::kern::wb::WBErrorException& e) {
+    } catch (const qv::host::errors::WBErrorException& e) {
         return e.code();
     } catch (const std::bad_alloc&) {
         return kWBMemFullErr;

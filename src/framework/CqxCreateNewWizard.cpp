@@ -1,8 +1,8 @@
 // The framework's create-new wizard base.
 #include "framework/CqxCreateNewWizard.h"
 
-#include "framework/com/CallGuard.h"
-#include "framework/com/TaskMem.h"
+#include "com/CallGuard.h"
+#include "com/TaskMem.h"
 
 using qv::com::ComPtr;
 using qv::com::GuardCall;

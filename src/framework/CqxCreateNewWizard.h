@@ -2,11 +2,11 @@
 // description list, and calls the bind, run and describe hooks a concrete wizard overrides.
 #pragma once
 
+#include "com/ComPtr.h"
+#include "com/InterfaceList.h"
 #include "framework/IqxBindable.h"
 #include "framework/IqxCreateNewWizard.h"
 #include "framework/IqxProvider.h"
-#include "framework/com/ComPtr.h"
-#include "framework/com/InterfaceList.h"
 #include "host/contracts/IwbProjectItem.h"
 
 #include <string>

@@ -1,8 +1,8 @@
 // The framework's item base.
 #include "framework/CqxItemUI.h"
 
-#include "framework/com/CallGuard.h"
-#include "framework/com/TaskMem.h"
+#include "com/CallGuard.h"
+#include "com/TaskMem.h"
 
 using qv::com::AllocBstr;
 using qv::com::ComPtr;

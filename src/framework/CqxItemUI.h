@@ -2,12 +2,12 @@
 // provider check, over hooks that concrete items override.
 #pragma once
 
+#include "com/ComPtr.h"
+#include "com/InterfaceList.h"
 #include "framework/IqxBindable.h"
 #include "framework/IqxItemUI.h"
 #include "framework/IqxProjectItemValidator.h"
 #include "framework/IqxProvider.h"
-#include "framework/com/ComPtr.h"
-#include "framework/com/InterfaceList.h"
 #include "host/contracts/IwbProjectItem.h"
 
 #include <string>

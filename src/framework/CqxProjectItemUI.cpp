@@ -1,8 +1,8 @@
 // The framework's project item base.
 #include "framework/CqxProjectItemUI.h"
 
-#include "framework/com/CallGuard.h"
-#include "framework/com/TaskMem.h"
+#include "com/CallGuard.h"
+#include "com/TaskMem.h"
 
 #include <algorithm>
 

@@ -1,9 +1,9 @@
 // The provider base: argument checks, exception guards and array hand-out around the hooks.
 #include "framework/CqxProvider.h"
 
+#include "com/CallGuard.h"
+#include "com/TaskMem.h"
 #include "framework/CqxProviderList.h"
-#include "framework/com/CallGuard.h"
-#include "framework/com/TaskMem.h"
 
 using qv::com::GuardCall;
 

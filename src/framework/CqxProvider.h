@@ -2,10 +2,10 @@
 // overrides; the base declines to create anything and names no type.
 #pragma once
 
+#include "com/ComPtr.h"
+#include "com/InterfaceList.h"
 #include "framework/CqxpItemInfo.h"
 #include "framework/IqxProvider.h"
-#include "framework/com/ComPtr.h"
-#include "framework/com/InterfaceList.h"
 
 #include <vector>
 

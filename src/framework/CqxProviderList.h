@@ -2,7 +2,7 @@
 // that the host gets back when it asks for the shared one.
 #pragma once
 
-#include "framework/com/ComPtr.h"
+#include "com/ComPtr.h"
 
 #include <mutex>
 #include <vector>

@@ -2,8 +2,8 @@
 // makes the type's objects.
 #pragma once
 
+#include "com/ComObject.h"
 #include "framework/IqxProvider.h"
-#include "framework/com/ComObject.h"
 
 #include <concepts>
 #include <memory>

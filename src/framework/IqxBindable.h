@@ -1,7 +1,7 @@
 // Offered by item and wizard objects: binding to the project item they stand for.
 #pragma once
 
-#include "framework/com/IUnknown.h"
+#include "com/IUnknown.h"
 
 struct IwbProjectItem;
 

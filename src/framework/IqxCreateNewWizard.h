@@ -1,8 +1,8 @@
 // The create-new wizard of a provider: describes the items it can add and adds them.
 #pragma once
 
-#include "framework/com/Bstr.h"
-#include "framework/com/IUnknown.h"
+#include "com/Bstr.h"
+#include "com/IUnknown.h"
 
 #include <cstddef>
 

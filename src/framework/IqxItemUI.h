@@ -1,8 +1,8 @@
 // The main interface of an item object in the project tree, and its context-menu entry record.
 #pragma once
 
-#include "framework/com/Bstr.h"
-#include "framework/com/IUnknown.h"
+#include "com/Bstr.h"
+#include "com/IUnknown.h"
 
 #include <cstddef>
 

@@ -1,8 +1,8 @@
 // The project-tree side of an item object: renames, properties, overlays, removal queries.
 #pragma once
 
-#include "framework/com/Bstr.h"
-#include "framework/com/IUnknown.h"
+#include "com/Bstr.h"
+#include "com/IUnknown.h"
 
 struct IqxProjectItemUI : IUnknown {
     static constexpr IID iid = qv::com::ParseGuid("CCAC84A4-B4CE-452A-8286-89E841C04F8D");

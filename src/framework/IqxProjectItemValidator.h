@@ -1,7 +1,7 @@
 // Offered by item objects: whether the item belongs to a given provider.
 #pragma once
 
-#include "framework/com/IUnknown.h"
+#include "com/IUnknown.h"
 
 struct IqxProjectItemValidator : IUnknown {
     static constexpr IID iid = qv::com::ParseGuid("A66D0169-95AC-4E40-90FA-034E3061B608");

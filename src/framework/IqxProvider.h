@@ -1,8 +1,8 @@
 // The interface through which the project framework talks to a project provider.
 #pragma once
 
-#include "framework/com/Bstr.h"
-#include "framework/com/IUnknown.h"
+#include "com/Bstr.h"
+#include "com/IUnknown.h"
 
 // Null out-parameters give E_POINTER; arrays handed out come from CoTaskMemAlloc.
 struct IqxProvider : IUnknown {

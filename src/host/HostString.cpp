@@ -3,7 +3,7 @@
 #include "host/HostString.h"
 
 #include "host/binding/HostFunctions.h"
-#include "kern/wb/ThrowIfWBError.h"
+#include "host/errors/ThrowIfWBError.h"
 
 #include <cstdint>
 #include <cstring>
@@ -31,9 +31,9 @@ std::string ReadHostString(HostString text) {
 
 void WriteHostString(HostString& text, std::string_view bytes) {
     if (bytes.size() > static_cast<size_t>(std::numeric_limits<int32_t>::max())) {
-        kern::wb::ThrowIfWBError(kOutOfMemory);
+        errors::ThrowIfWBError(kOutOfMemory);
     }
-    kern::wb::ThrowIfWBError(rt::NumericArrayResize(kWBTypeU8, 1, &text, bytes.size()));
+    errors::ThrowIfWBError(rt::NumericArrayResize(kWBTypeU8, 1, &text, bytes.size()));
     const auto count = static_cast<int32_t>(bytes.size());
     std::memcpy(*text, &count, sizeof count);
     if (!bytes.empty()) {

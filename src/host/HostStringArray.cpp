@@ -3,7 +3,7 @@
 #include "host/HostStringArray.h"
 
 #include "host/binding/HostFunctions.h"
-#include "kern/wb/ThrowIfWBError.h"
+#include "host/errors/ThrowIfWBError.h"
 
 #include <cstring>
 #include <limits>
@@ -49,7 +49,7 @@ void ReleaseElements(HostStringArray array, int32_t from, int32_t to) {
     for (int32_t i = from; i < to; ++i) {
         // A null element holds no string: there is nothing to hand back to the host.
         if (HostString element = LoadElement(array, i)) {
-            kern::wb::ThrowIfWBError(rt::DSDisposeHandle(element));
+            errors::ThrowIfWBError(rt::DSDisposeHandle(element));
             StoreElement(array, i, nullptr);
         }
     }
@@ -66,7 +66,7 @@ int32_t HostStringArrayCount(HostStringArray array) {
 }
 
 HostString HostStringArrayElement(HostStringArray array, int32_t index) {
-    kern::wb::CheckArrayIndex(index, HostStringArrayCount(array));
+    errors::CheckArrayIndex(index, HostStringArrayCount(array));
     return LoadElement(array, index);
 }
 
@@ -94,7 +94,7 @@ std::vector<std::string> ReadHostStringArray(HostStringArray array) {
 }
 
 void ResizeHostStringArray(HostStringArray& array, int32_t newSize) {
-    kern::wb::CheckNewArraySize(newSize);
+    errors::CheckNewArraySize(newSize);
     const bool absent = array == nullptr || *array == nullptr;
     const int32_t current = absent ? -1 : StoredCount(array);
     if (current == newSize) {
@@ -105,9 +105,9 @@ void ResizeHostStringArray(HostStringArray& array, int32_t newSize) {
     }
     if (array == nullptr) {
         array = rt::DSNewHClr(BlockSize(newSize));
-        kern::wb::ThrowIfNoHandle(array);
+        errors::ThrowIfNoHandle(array);
     } else {
-        kern::wb::ThrowIfWBError(rt::DSSetHSzClr(array, BlockSize(newSize)));
+        errors::ThrowIfWBError(rt::DSSetHSzClr(array, BlockSize(newSize)));
     }
     // An absent array, or one whose stored count is negative, has no elements to keep. The count
     // follows every element added, so a failure part way leaves a consistent, shorter array.
@@ -123,7 +123,7 @@ void ResizeHostStringArray(HostStringArray& array, int32_t newSize) {
 
 void WriteHostStringArray(HostStringArray& array, const std::vector<std::string>& texts) {
     if (texts.size() > static_cast<size_t>(std::numeric_limits<int32_t>::max())) {
-        kern::wb::CheckNewArraySize(-1);
+        errors::CheckNewArraySize(-1);
     }
     ResizeHostStringArray(array, static_cast<int32_t>(texts.size()));
     for (size_t i = 0; i < texts.size(); ++i) {

@@ -1,10 +1,10 @@
 // qxGetProvider's rules for the current and private providers.
 #include "provider/ProviderEntry.h"
 
+#include "com/CallGuard.h"
+#include "com/ComObject.h"
+#include "com/ComPtr.h"
 #include "framework/CqxProviderList.h"
-#include "framework/com/CallGuard.h"
-#include "framework/com/ComObject.h"
-#include "framework/com/ComPtr.h"
 #include "provider/TIOProvider.h"
 
 #include <mutex>

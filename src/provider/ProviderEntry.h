@@ -1,7 +1,7 @@
 // The module entry behind the export qxGetProvider.
 #pragma once
 
-#include "framework/com/HResult.h"
+#include "com/HResult.h"
 
 #include <cstdint>
 

@@ -1,7 +1,7 @@
 // The identifiers the provider answers and registers.
 #pragma once
 
-#include "framework/com/ComGuid.h"
+#include "com/ComGuid.h"
 
 namespace tio {
 // The framework's generic item, as created by this provider.

@@ -1,8 +1,8 @@
 // The provider's overrides of the framework base, and its project attachment.
 #include "provider/TIOProvider.h"
 
+#include "com/ComInit.h"
 #include "framework/IqxProjectItemValidator.h"
-#include "framework/com/ComInit.h"
 #include "provider/TIOIdentifiers.h"
 #include "provider/TIOItemRegistry.h"
 #include "provider/TIOModule.h"

@@ -2,8 +2,8 @@
 // plug-in offers, creates its items and attaches it to the host's project.
 #pragma once
 
+#include "com/ComPtr.h"
 #include "framework/CqxProvider.h"
-#include "framework/com/ComPtr.h"
 #include "host/contracts/IwbProjectProvider.h"
 
 class TIOProvider : public CqxProvider, public IwbProjectProvider {

@@ -1,10 +1,10 @@
 // The item, project item and wizard bases: provider identity, menus, overlays, names and
 // descriptions handed across the interface.
+#include "com/ComObject.h"
+#include "com/TaskMem.h"
 #include "framework/CqxCreateNewWizard.h"
 #include "framework/CqxProjectItemUI.h"
 #include "framework/CqxProvider.h"
-#include "framework/com/ComObject.h"
-#include "framework/com/TaskMem.h"
 
 #include <gtest/gtest.h>
 

@@ -2,12 +2,12 @@
 // item creation through the registry, type lists and names, and project attachment.
 #include "provider/TIOProvider.h"
 
+#include "com/ComInit.h"
+#include "com/ComObject.h"
+#include "com/TaskMem.h"
 #include "framework/IqxBindable.h"
 #include "framework/IqxCreateNewWizard.h"
 #include "framework/IqxProjectItemValidator.h"
-#include "framework/com/ComInit.h"
-#include "framework/com/ComObject.h"
-#include "framework/com/TaskMem.h"
 #include "items/TIOInstanceItemUI.h"
 #include "provider/ProviderEntry.h"
 #include "provider/TIOIdentifiers.h"

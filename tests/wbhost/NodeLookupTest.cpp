@@ -1,6 +1,6 @@
 // Finding nodes by path through the node interface, and how much of a path matched.
 #include "TestObjects.h"
-#include "framework/com/TaskMem.h"
+#include "com/TaskMem.h"
 #include "resources/ResourceService.h"
 
 #include <gtest/gtest.h>

@@ -2,8 +2,8 @@
 // objects standing in for provider-made item objects and selectors.
 #pragma once
 
-#include "framework/com/ComObject.h"
-#include "framework/com/ComPtr.h"
+#include "com/ComObject.h"
+#include "com/ComPtr.h"
 #include "host/contracts/IwbProjectItem.h"
 #include "host/contracts/IwbProjectItemScope.h"
 #include "host/contracts/IwbProjectItemSelector.h"

@@ -1,6 +1,6 @@
 // Reservations of resource nodes by project items.
 #include "TestObjects.h"
-#include "framework/com/TaskMem.h"
+#include "com/TaskMem.h"
 #include "host/contracts/IwbhwResourceReservation.h"
 #include "host/contracts/IwbhwResourceTreeAccess.h"
 #include "resources/ResourceService.h"

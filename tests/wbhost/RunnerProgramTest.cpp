@@ -1,7 +1,7 @@
 // The program runner as the module reaches it: root object, runner service, runner, programs.
 #include "TestObjects.h"
-#include "framework/com/Bstr.h"
-#include "framework/com/TaskMem.h"
+#include "com/Bstr.h"
+#include "com/TaskMem.h"
 #include "runner/HostProgram.h"
 #include "runner/ProgramFile.h"
 #include "runner/RunnerService.h"

@@ -1,7 +1,7 @@
 // The target's hardware object: which resources fit an I/O interface under a protocol filter.
 #include "resources/TargetHardware.h"
 
-#include "framework/com/TaskMem.h"
+#include "com/TaskMem.h"
 #include "resources/ResourceService.h"
 
 #include <gtest/gtest.h>

@@ -2,8 +2,8 @@
 // and a project item that only has an identity.
 #pragma once
 
-#include "framework/com/ComObject.h"
-#include "framework/com/ComPtr.h"
+#include "com/ComObject.h"
+#include "com/ComPtr.h"
 #include "host/contracts/IwbProjectItem.h"
 #include "host/contracts/IwbhwResourceTreeNode.h"
 #include "host/contracts/IwbhwResourceTreeNodeObserver.h"

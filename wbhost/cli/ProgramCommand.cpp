@@ -3,7 +3,7 @@
 
 #include "cli/Answers.h"
 #include "cli/HostText.h"
-#include "framework/com/ComPtr.h"
+#include "com/ComPtr.h"
 #include "host/contracts/IwbProgram.h"
 #include "host/contracts/IwbProgramRunner.h"
 #include "host/contracts/IwbProgramRunnerService.h"

@@ -1,7 +1,7 @@
 // The project's map from item information records to the items' objects.
 #pragma once
 
-#include "framework/com/ComObject.h"
+#include "com/ComObject.h"
 #include "host/contracts/IwbProjectItem.h"
 #include "host/contracts/IwbProjectItemUIMap.h"
 

@@ -2,7 +2,7 @@
 // trees, folders, and the items providers make), saved to and reopened from a project file.
 #pragma once
 
-#include "framework/com/ComPtr.h"
+#include "com/ComPtr.h"
 #include "host/contracts/IwbProjectItemUIMap.h"
 #include "host/contracts/IwbProjectProvider.h"
 #include "project/ProjectFormat.h"

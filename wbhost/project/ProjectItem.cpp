@@ -1,7 +1,7 @@
 // The host's project item.
 #include "project/ProjectItem.h"
 
-#include "framework/com/CallGuard.h"
+#include "com/CallGuard.h"
 #include "host/contracts/IwbProjectItemScope.h"
 #include "host/contracts/IwbProjectItemSelector.h"
 #include "host/contracts/IwbProjectItemUIMap.h"

@@ -2,8 +2,8 @@
 // word, properties and the object its provider made for it.
 #pragma once
 
-#include "framework/com/ComObject.h"
-#include "framework/com/ComPtr.h"
+#include "com/ComObject.h"
+#include "com/ComPtr.h"
 #include "host/contracts/IwbProjectItem.h"
 #include "project/PropertyBag.h"
 

@@ -1,7 +1,7 @@
 // The host's property bag.
 #include "project/PropertyBag.h"
 
-#include "framework/com/CallGuard.h"
+#include "com/CallGuard.h"
 
 #include <string_view>
 

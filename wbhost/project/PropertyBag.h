@@ -1,7 +1,7 @@
 // An item's typed properties, as the host keeps and saves them.
 #pragma once
 
-#include "framework/com/ComObject.h"
+#include "com/ComObject.h"
 #include "host/contracts/IwbProjectPropertyBag.h"
 
 #include <cstdint>

@@ -1,8 +1,8 @@
 // Item objects made by a module's provider.
 #include "project/ProviderFactory.h"
 
+#include "com/TaskMem.h"
 #include "framework/IqxBindable.h"
-#include "framework/com/TaskMem.h"
 
 #include <algorithm>
 #include <vector>

@@ -1,8 +1,8 @@
 // A module's provider as the maker of the project's item objects.
 #pragma once
 
+#include "com/ComPtr.h"
 #include "framework/IqxProvider.h"
-#include "framework/com/ComPtr.h"
 #include "project/Project.h"
 
 namespace wbhost::project {

@@ -1,7 +1,7 @@
 // The target item's object.
 #include "project/TargetObject.h"
 
-#include "framework/com/CallGuard.h"
+#include "com/CallGuard.h"
 
 namespace wbhost::project {
 

@@ -1,8 +1,8 @@
 // The object behind a target item: its resource tree and its I/O items' change handling.
 #pragma once
 
-#include "framework/com/ComObject.h"
-#include "framework/com/ComPtr.h"
+#include "com/ComObject.h"
+#include "com/ComPtr.h"
 #include "host/contracts/IwbProjectItemScope.h"
 #include "host/contracts/IwbTargetItemChange.h"
 #include "host/contracts/IwbhwResourceTreeProvider.h"

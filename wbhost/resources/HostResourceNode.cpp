@@ -1,7 +1,7 @@
 // The COM object of a host resource-tree node.
 #include "resources/HostResourceNode.h"
 
-#include "framework/com/TaskMem.h"
+#include "com/TaskMem.h"
 #include "kern/Collate.h"
 #include "resource_tree/ListText.h"
 #include "resource_tree/ResTreeWriter.h"

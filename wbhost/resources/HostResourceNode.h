@@ -2,7 +2,7 @@
 // use, the access interface that exports use, and the reservation query.
 #pragma once
 
-#include "framework/com/ComObject.h"
+#include "com/ComObject.h"
 #include "host/contracts/IwbhwResourceReservation.h"
 #include "host/contracts/IwbhwResourceTreeAccess.h"
 #include "host/contracts/IwbhwResourceTreeNode.h"

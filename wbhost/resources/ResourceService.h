@@ -2,7 +2,7 @@
 // documents, each reachable through a refnum as host programs reach it.
 #pragma once
 
-#include "framework/com/ComPtr.h"
+#include "com/ComPtr.h"
 #include "host/binding/runtime_api.h"
 #include "host/contracts/IwbhwTargetResources.h"
 #include "resources/ResourceTree.h"

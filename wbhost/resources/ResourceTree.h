@@ -2,7 +2,7 @@
 // for each node its observers, its reservations and the COM object that stands for it.
 #pragma once
 
-#include "framework/com/ComPtr.h"
+#include "com/ComPtr.h"
 #include "host/contracts/IwbProjectItem.h"
 #include "host/contracts/IwbhwResourceTreeNode.h"
 #include "host/contracts/IwbhwResourceTreeNodeObserver.h"

@@ -1,7 +1,7 @@
 // The hardware object of a target.
 #include "resources/TargetHardware.h"
 
-#include "framework/com/TaskMem.h"
+#include "com/TaskMem.h"
 #include "kern/Collate.h"
 #include "resource_tree/ListText.h"
 #include "resources/HostResourceNode.h"

@@ -2,7 +2,7 @@
 // interface.
 #pragma once
 
-#include "framework/com/ComObject.h"
+#include "com/ComObject.h"
 #include "host/contracts/IwbhwResourceTreeProvider.h"
 #include "host/contracts/IwbhwTargetResources.h"
 #include "resources/ResourceTree.h"

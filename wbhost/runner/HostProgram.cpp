@@ -1,8 +1,8 @@
 // The host program object: inputs, a run through the session's behaviour, outputs.
 #include "runner/HostProgram.h"
 
-#include "framework/com/CallGuard.h"
-#include "framework/com/TaskMem.h"
+#include "com/CallGuard.h"
+#include "com/TaskMem.h"
 #include "runner/Behaviours.h"
 
 namespace wbhost::runner {

@@ -1,7 +1,7 @@
 // An opened host program: the IwbProgram the runner hands out for a program file.
 #pragma once
 
-#include "framework/com/ComObject.h"
+#include "com/ComObject.h"
 #include "host/contracts/IwbProgram.h"
 #include "runner/ProgramFile.h"
 #include "runner/ProgramSession.h"

@@ -1,7 +1,7 @@
 // The host program runner.
 #include "runner/HostProgramRunner.h"
 
-#include "framework/com/CallGuard.h"
+#include "com/CallGuard.h"
 #include "kern/Utf8.h"
 #include "runner/Behaviours.h"
 #include "runner/HostProgram.h"

@@ -2,7 +2,7 @@
 // project items and loads icons for the module.
 #pragma once
 
-#include "framework/com/ComObject.h"
+#include "com/ComObject.h"
 #include "host/contracts/IwbProgramRunner.h"
 #include "runner/ProgramSession.h"
 

@@ -1,7 +1,7 @@
 // The runner service.
 #include "runner/RunnerService.h"
 
-#include "framework/com/CallGuard.h"
+#include "com/CallGuard.h"
 
 namespace wbhost::runner {
 

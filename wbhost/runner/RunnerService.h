@@ -1,8 +1,8 @@
 // The runner service of the framework's root object: creates program runners for the module.
 #pragma once
 
-#include "framework/com/ComObject.h"
-#include "framework/com/ComPtr.h"
+#include "com/ComObject.h"
+#include "com/ComPtr.h"
 #include "host/contracts/IwbProgramRunnerService.h"
 #include "runner/HostProgramRunner.h"
 

@@ -1,7 +1,7 @@
 // The host's reference numbers: 32-bit numbers that host programs hold in place of COM objects.
 #pragma once
 
-#include "framework/com/IUnknown.h"
+#include "com/IUnknown.h"
 #include "host/binding/runtime_api.h"
 
 #include <mutex>

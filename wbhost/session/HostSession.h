@@ -2,8 +2,8 @@
 // project and the program session, tied together through the framework's root object.
 #pragma once
 
+#include "com/ComPtr.h"
 #include "framework/IqxProvider.h"
-#include "framework/com/ComPtr.h"
 #include "project/Project.h"
 #include "resources/ResourceService.h"
 #include "runner/ProgramSession.h"

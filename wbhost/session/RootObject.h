@@ -2,8 +2,8 @@
 // host's services.
 #pragma once
 
-#include "framework/com/ComObject.h"
-#include "framework/com/ComPtr.h"
+#include "com/ComObject.h"
+#include "com/ComPtr.h"
 #include "host/contracts/IwbProgramRunnerService.h"
 
 namespace wbhost::session {

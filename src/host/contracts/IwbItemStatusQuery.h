@@ -2,7 +2,7 @@
 // context (an item that answers true is skipped by resource lookups).
 #pragma once
 
-#include "framework/com/IUnknown.h"
+#include "com/IUnknown.h"
 
 struct IwbItemStatusQuery : IUnknown {
     static constexpr IID iid = qv::com::ParseGuid("85B4BAC4-01A9-4131-B06A-45C030F6B28C");

@@ -1,8 +1,8 @@
 // An opened host program: inputs are set and outputs read by terminal index around Run.
 #pragma once
 
-#include "framework/com/Bstr.h"
-#include "framework/com/IUnknown.h"
+#include "com/Bstr.h"
+#include "com/IUnknown.h"
 
 // An index the program does not have, or of the wrong type, gives E_INVALIDARG. Texts handed
 // out are new BSTRs; lists are CoTaskMemAlloc arrays of BSTRs.

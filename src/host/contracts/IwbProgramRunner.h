@@ -1,7 +1,7 @@
 // The host program runner: opens host programs (".gx" files) and makes host references.
 #pragma once
 
-#include "framework/com/IUnknown.h"
+#include "com/IUnknown.h"
 
 struct IwbProgram;
 struct IwbProjectItem;

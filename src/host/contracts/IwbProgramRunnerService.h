@@ -1,7 +1,7 @@
 // The service of the framework's root object that creates the host program runner.
 #pragma once
 
-#include "framework/com/IUnknown.h"
+#include "com/IUnknown.h"
 
 namespace wbproj {
 // Class and interface identifier with which the runner is created from the service.

@@ -1,8 +1,8 @@
 // The host's project item: the project-side object behind each item, its target and folders.
 #pragma once
 
-#include "framework/com/Bstr.h"
-#include "framework/com/IUnknown.h"
+#include "com/Bstr.h"
+#include "com/IUnknown.h"
 
 struct IwbProjectItemSelector;
 struct IwbProjectItemUIMap;

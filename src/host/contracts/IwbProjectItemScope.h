@@ -2,7 +2,7 @@
 // enumerations do not descend below it.
 #pragma once
 
-#include "framework/com/IUnknown.h"
+#include "com/IUnknown.h"
 
 struct IwbProjectItemScope : IUnknown {
     static constexpr IID iid = qv::com::ParseGuid("12F25D6D-970E-4D52-AEC9-DB77752609B9");

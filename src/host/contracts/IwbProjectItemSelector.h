@@ -1,7 +1,7 @@
 // Called by the host for each item of an enumeration (IwbProjectItem::EnumerateItems).
 #pragma once
 
-#include "framework/com/IUnknown.h"
+#include "com/IUnknown.h"
 
 struct IwbProjectItem;
 

@@ -1,7 +1,7 @@
 // The project item information record, and the host object that maps records to item objects.
 #pragma once
 
-#include "framework/com/IUnknown.h"
+#include "com/IUnknown.h"
 
 #include <cstddef>
 

@@ -1,8 +1,8 @@
 // Typed properties of a project item, saved and loaded with the project by the host.
 #pragma once
 
-#include "framework/com/Bstr.h"
-#include "framework/com/IUnknown.h"
+#include "com/Bstr.h"
+#include "com/IUnknown.h"
 
 // A read answers 1 (and leaves a null or zero value) when the property is absent. Every write
 // takes a flag word that the host interprets. Values written read back unchanged, also after

@@ -1,7 +1,7 @@
 // Implemented by a project provider: the host attaches it to its project and detaches it.
 #pragma once
 
-#include "framework/com/IUnknown.h"
+#include "com/IUnknown.h"
 
 struct IwbProjectProvider : IUnknown {
     static constexpr IID iid = qv::com::ParseGuid("D95B2FDD-6054-4090-A719-3FE8C2EB0500");

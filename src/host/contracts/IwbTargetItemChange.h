@@ -1,7 +1,7 @@
 // Offered by a target's object: told when one of its I/O items changed.
 #pragma once
 
-#include "framework/com/IUnknown.h"
+#include "com/IUnknown.h"
 
 struct IwbTargetItemChange : IUnknown {
     static constexpr IID iid = qv::com::ParseGuid("8561E63D-CADA-41E9-9156-B13A9AF7C03B");

@@ -1,7 +1,7 @@
 // Reservation queries on a node found through IwbhwResourceTreeAccess.
 #pragma once
 
-#include "framework/com/IUnknown.h"
+#include "com/IUnknown.h"
 
 struct IwbhwResourceReservation : IUnknown {
     static constexpr IID iid = qv::com::ParseGuid("A0E48592-79B7-41C2-BA2A-7C1828EFE2D5");

@@ -1,8 +1,8 @@
 // The node interface the hardware-resource service gives out for a resource-tree refnum.
 #pragma once
 
-#include "framework/com/Bstr.h"
-#include "framework/com/IUnknown.h"
+#include "com/Bstr.h"
+#include "com/IUnknown.h"
 
 // Nodes found through FindNode are used through this same interface.
 struct IwbhwResourceTreeAccess : IUnknown {

@@ -1,8 +1,8 @@
 // A node of a host resource tree (a target's lines, channels and their definitions).
 #pragma once
 
-#include "framework/com/Bstr.h"
-#include "framework/com/IUnknown.h"
+#include "com/Bstr.h"
+#include "com/IUnknown.h"
 
 struct IwbhwResourceTreeNodeObserver;
 struct IwbProjectItem;

@@ -1,7 +1,7 @@
 // Observer of a host resource-tree node, and the event bits nodes report to it.
 #pragma once
 
-#include "framework/com/IUnknown.h"
+#include "com/IUnknown.h"
 
 namespace wbhw::node_event {
 // The event bits of resource-tree node changes; an observer hears only the bits of its mask.

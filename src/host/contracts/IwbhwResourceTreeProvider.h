@@ -1,7 +1,7 @@
 // Offered by the object of a project item that owns a resource tree (a hardware target).
 #pragma once
 
-#include "framework/com/IUnknown.h"
+#include "com/IUnknown.h"
 
 struct IwbhwResourceTreeNode;
 

@@ -1,8 +1,8 @@
 // Offered by a target's hardware object: the resources that fit an I/O interface.
 #pragma once
 
-#include "framework/com/Bstr.h"
-#include "framework/com/IUnknown.h"
+#include "com/Bstr.h"
+#include "com/IUnknown.h"
 
 struct IwbhwTargetResources : IUnknown {
     static constexpr IID iid = qv::com::ParseGuid("F778DB5E-56CA-4A48-AB1F-FC29411FC211");

@@ -2,8 +2,8 @@
 // they are answered as host error 2 with E_OUTOFMEMORY.
 #include "host/refs/CAppRef.h"
 
-#include "framework/com/ComObject.h"
-#include "framework/com/ComPtr.h"
+#include "com/ComObject.h"
+#include "com/ComPtr.h"
 #include "host/binding/RuntimeLoader.h"
 #include "host/binding/runtime_api.h"
 

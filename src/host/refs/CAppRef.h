@@ -1,7 +1,7 @@
 // The application reference object (I_AppRef) and the program reference object (I_GXRef).
 #pragma once
 
-#include "framework/com/InterfaceList.h"
+#include "com/InterfaceList.h"
 #include "host/refs/RefInterfaces.h"
 #include "host/refs/WBRef.h"
 

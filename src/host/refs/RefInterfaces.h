@@ -2,7 +2,7 @@
 // opens. Every operation answers a status and, through ERROR, a host error code (0 = none).
 #pragma once
 
-#include "framework/com/IUnknown.h"
+#include "com/IUnknown.h"
 
 #include <cstdint>
 

@@ -1,7 +1,7 @@
 // The runner path of host programs.
 #include "host/runner/ProgramRunner.h"
 
-#include "framework/com/CallGuard.h"
+#include "com/CallGuard.h"
 #include "host/contracts/IwbProgramRunnerService.h"
 #include "kern/Utf8.h"
 

@@ -2,7 +2,7 @@
 // root object provides.
 #pragma once
 
-#include "framework/com/ComPtr.h"
+#include "com/ComPtr.h"
 #include "host/contracts/IwbProgram.h"
 #include "host/contracts/IwbProgramRunner.h"
 

@@ -1,7 +1,7 @@
 // Opening host programs through the runner of the framework's root object.
 #include "host/runner/ProgramRunner.h"
 
-#include "framework/com/ComObject.h"
+#include "com/ComObject.h"
 #include "host/contracts/IwbProgramRunnerService.h"
 
 #include <cstdio>

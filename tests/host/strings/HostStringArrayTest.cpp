@@ -1,7 +1,7 @@
 // Host string arrays: bounds, resizing in both directions, and arrays the host made itself.
 #include "host/HostStringArray.h"
 
-#include "kern/wb/WBErrorException.h"
+#include "host/errors/WBErrorException.h"
 #include "runtime/HandleTable.h"
 #include "runtime/Runtime.h"
 
@@ -9,7 +9,7 @@
 #include <gtest/gtest.h>
 
 using namespace qv::host;
-using qv::kern::wb::WBErrorException;
+using qv::host::errors::WBErrorException;
 
 namespace {
 

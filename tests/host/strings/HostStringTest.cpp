@@ -1,7 +1,7 @@
 // Host strings written and read through the real host runtime, whose blocks move on resize.
 #include "host/HostString.h"
 
-#include "kern/wb/WBErrorException.h"
+#include "host/errors/WBErrorException.h"
 #include "runtime/Runtime.h"
 
 #include <cstring>
@@ -46,7 +46,7 @@ TEST(HostString, HandleTheHostDoesNotKnowRaisesItsError) {
     try {
         WriteHostString(bogus, "x");
         FAIL() << "an unknown handle must not be written";
-    } catch (const qv::kern::wb::WBErrorException& error) {
+    } catch (const qv::host::errors::WBErrorException& error) {
         EXPECT_EQ(error.code(), 1);
     }
 }

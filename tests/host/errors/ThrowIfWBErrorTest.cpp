@@ -1,0 +1,59 @@
+// The check after host calls and the host-array checks: what they raise and from where.
+#include "host/errors/ThrowIfWBError.h"
+
+#include "host/errors/WBErrorException.h"
+
+#include <gtest/gtest.h>
+#include <string>
+
+using qv::host::errors::CheckArrayIndex;
+using qv::host::errors::CheckNewArraySize;
+using qv::host::errors::ThrowIfNoHandle;
+using qv::host::errors::ThrowIfWBError;
+using qv::host::errors::WBErrorException;
+
+namespace {
+
+std::string MessageOf(void (*raise)()) {
+    try {
+        raise();
+    } catch (const WBErrorException& error) {
+        return error.what();
+    }
+    return "(nothing raised)";
+}
+
+TEST(ThrowIfWBError, RaisesNonZeroCodesWithItsOwnLocationAndCopiesKeepIt) {
+    EXPECT_NO_THROW(ThrowIfWBError(0));
+    try {
+        ThrowIfWBError(53);
+        FAIL() << "53 must raise";
+    } catch (const qv::kern::exception::Exception& error) {
+        const auto* hostError = dynamic_cast<const WBErrorException*>(&error);
+        ASSERT_NE(hostError, nullptr);
+        EXPECT_EQ(hostError->code(), 53);
+        EXPECT_NE(std::string(error.file()).find("ThrowIfWBError.cpp"), std::string::npos);
+        EXPECT_GT(error.line(), 0u);
+        const WBErrorException copy = *hostError;
+        EXPECT_EQ(copy.file(), error.file());
+        EXPECT_EQ(copy.line(), error.line());
+        EXPECT_STREQ(copy.what(), error.what());
+    }
+}
+
+TEST(HostArrayChecks, BoundsAndSizes) {
+    EXPECT_NO_THROW(CheckArrayIndex(2, 3));
+    EXPECT_EQ(MessageOf([] { CheckArrayIndex(3, 3); }),
+              "Error Code: 1 (00000001): Array index out of bounds.");
+    EXPECT_EQ(MessageOf([] { CheckArrayIndex(-1, 3); }),
+              "Error Code: 1 (00000001): Array index out of bounds.");
+    EXPECT_EQ(MessageOf([] { CheckArrayIndex(0, 0); }),
+              "Error Code: 1 (00000001): Array index out of bounds.");
+    EXPECT_NO_THROW(CheckNewArraySize(0));
+    EXPECT_EQ(MessageOf([] { CheckNewArraySize(-1); }),
+              "Error Code: 1 (00000001): Invalid new_size for array.");
+    EXPECT_EQ(MessageOf([] { ThrowIfNoHandle(nullptr); }),
+              "Error Code: 2 (00000002): The host ran out of memory.");
+}
+
+} // namespace
