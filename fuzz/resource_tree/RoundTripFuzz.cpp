@@ -1,6 +1,7 @@
 // Load, write, load: whenever the writer says its document loads back the same, the two trees
 // must be equal, and writing the second gives the same document.
 #include "FuzzSupport.h"
+#include "kern/Utf8.h"
 #include "resource_tree/ResTreeNode.h"
 #include "resource_tree/ResTreeWriter.h"
 
@@ -22,13 +23,13 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
     wbhw::ResTreeNode second(wbhw::WString(), wbhw::WString(), false);
     if (second.ParseText(written.xml, false, nullptr, &settings) != 0) {
         std::fprintf(stderr, "written document does not load:\n%s\n",
-                     wbhw::ToUtf8(written.xml).c_str());
+                     qv::kern::WideToStandardUtf8(written.xml).c_str());
         std::abort();
     }
     std::u16string difference;
     if (!wbhw::EqualResTrees(first, second, &difference)) {
-        std::fprintf(stderr, "%s\n%s\n", wbhw::ToUtf8(difference).c_str(),
-                     wbhw::ToUtf8(written.xml).c_str());
+        std::fprintf(stderr, "%s\n%s\n", qv::kern::WideToStandardUtf8(difference).c_str(),
+                     qv::kern::WideToStandardUtf8(written.xml).c_str());
         std::abort();
     }
     if (wbhw::WriteResTree(second, settings.language).xml != written.xml)

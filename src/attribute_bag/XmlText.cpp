@@ -1,9 +1,8 @@
 // Text helpers shared by the attribute-bag and cluster-XML forms.
 #include "attribute_bag/XmlText.h"
 
+#include "kern/Utf8.h"
 #include "resource_tree/XmlEscape.h"
-
-#include <unicode/ustring.h>
 
 namespace wbhw {
 namespace {
@@ -13,28 +12,6 @@ bool IsForbiddenInXml(char16_t c) noexcept {
     if (c < 0x20)
         return c != u'\t' && c != u'\n' && c != u'\r';
     return c == 0xFFFE || c == 0xFFFF;
-}
-
-bool ConvertToUtf8(std::u16string_view wide, std::string& out, bool substitute) {
-    out.clear();
-    if (wide.empty())
-        return true;
-    // Three bytes per unit is the most UTF-8 ever needs for UTF-16 input.
-    out.resize(wide.size() * 3);
-    int32_t written = 0;
-    UErrorCode status = U_ZERO_ERROR;
-    const auto length = static_cast<int32_t>(wide.size());
-    if (substitute) {
-        u_strToUTF8WithSub(out.data(), static_cast<int32_t>(out.size()), &written, wide.data(),
-                           length, u'?', nullptr, &status);
-    } else {
-        u_strToUTF8(out.data(), static_cast<int32_t>(out.size()), &written, wide.data(), length,
-                    &status);
-    }
-    if (U_FAILURE(status))
-        return false;
-    out.resize(static_cast<size_t>(written));
-    return true;
 }
 
 } // namespace
@@ -63,13 +40,14 @@ std::string ToXmlUtf8Lenient(std::u16string_view wide) {
         wide = cleaned;
         break;
     }
-    std::string out;
-    ConvertToUtf8(wide, out, true);
-    return out;
+    return qv::kern::WideToStandardUtf8(wide, u'?');
 }
 
 bool ToUtf8Strict(std::u16string_view wide, std::string& out) {
-    return ConvertToUtf8(wide, out, false);
+    if (qv::kern::HasLoneSurrogate(wide))
+        return false;
+    out = qv::kern::WideToStandardUtf8(wide);
+    return true;
 }
 
 } // namespace wbhw

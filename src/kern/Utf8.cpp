@@ -1,11 +1,13 @@
-// UTF-8 <-> UTF-16 conversion with the module's own rules (three-byte maximum).
+// UTF-8 <-> UTF-16 conversion: the module's own rules (three-byte maximum) and standard UTF-8.
 #include "kern/Utf8.h"
 
 #include "kern/AsciiRun.h"
 #include "kern/exception/Exception.h"
 
+#include <algorithm>
 #include <cstdint>
 #include <cstring>
+#include <unicode/utf8.h>
 
 namespace qv::kern {
 namespace {
@@ -40,6 +42,25 @@ size_t DecodeOne(std::string_view s, size_t i, char16_t& unit) {
         return 3;
     }
     QV_THROW(exception::InvalidSequence());
+}
+
+bool IsHighSurrogate(char32_t c) noexcept {
+    return c >= 0xD800 && c < 0xDC00;
+}
+
+bool IsLowSurrogate(char32_t c) noexcept {
+    return c >= 0xDC00 && c < 0xE000;
+}
+
+// Narrows the leading ASCII units of FROM into TO; answers how many. The caller hands over one
+// block at a time, so the scan and the copy read the units from the cache, and the copy through
+// plain pointers is one the compiler widens to many units per step.
+size_t NarrowAscii(std::u16string_view from, char* to) noexcept {
+    const size_t ascii = AsciiPrefixLength(from);
+    const char16_t* const units = from.data();
+    for (size_t i = 0; i < ascii; ++i)
+        to[i] = static_cast<char>(units[i]);
+    return ascii;
 }
 
 } // namespace
@@ -90,6 +111,55 @@ std::string WideToUtf8(std::u16string_view wide) {
         }
     }
     return out;
+}
+
+std::string WideToStandardUtf8(std::u16string_view wide, char16_t lone) {
+    // Whole documents go through here before an XML reader sees them, and markup is nearly all
+    // ASCII. The output is made ready one block at a time, so that its zero fill and the
+    // narrowing meet the same cache lines; the room for one byte per unit is reserved at once.
+    constexpr size_t kBlock = 16384;
+    std::string out;
+    out.reserve(wide.size());
+    size_t i = 0;
+    while (i < wide.size()) {
+        const size_t end = i + std::min(kBlock, wide.size() - i);
+        size_t used = out.size();
+        out.resize(used + (end - i));
+        while (i < end) {
+            const size_t ascii = NarrowAscii(wide.substr(i, end - i), out.data() + used);
+            used += ascii;
+            i += ascii;
+            if (i == end)
+                break;
+            char32_t code = wide[i];
+            size_t units = 1;
+            if (IsHighSurrogate(code) && i + 1 < wide.size() && IsLowSurrogate(wide[i + 1])) {
+                code = 0x10000 + ((code - 0xD800) << 10) +
+                       (static_cast<char32_t>(wide[i + 1]) - 0xDC00);
+                units = 2; // a pair may end one unit past the block
+            } else if (lone != 0 && (IsHighSurrogate(code) || IsLowSurrogate(code))) {
+                code = lone;
+            }
+            i += units;
+            // Room for this character's bytes and one byte for each unit left in the block.
+            const size_t needed = used + 4 + (i < end ? end - i : 0);
+            if (needed > out.size())
+                out.resize(std::max(needed, out.size() + out.size() / 2));
+            U8_APPEND_UNSAFE(out.data(), used, code);
+        }
+        out.resize(used);
+    }
+    return out;
+}
+
+bool HasLoneSurrogate(std::u16string_view wide) noexcept {
+    for (size_t i = 0; i < wide.size(); ++i) {
+        if (IsHighSurrogate(wide[i]) && i + 1 < wide.size() && IsLowSurrogate(wide[i + 1]))
+            ++i;
+        else if (IsHighSurrogate(wide[i]) || IsLowSurrogate(wide[i]))
+            return true;
+    }
+    return false;
 }
 
 } // namespace qv::kern

@@ -2,13 +2,10 @@
 // platform paths and the UTF-8 form handed to Expat.
 #include "resource_tree/LoaderText.h"
 
-#include "kern/AsciiRun.h"
 #include "resource_tree/ExPatHandler.h"
 #include "resource_tree/ListText.h"
 
-#include <algorithm>
 #include <array>
-#include <unicode/utf8.h>
 #include <unistd.h>
 
 namespace wbhw {
@@ -111,17 +108,6 @@ std::string FindHostDirectory() {
             return directory;
         at = DirectoryOf(at);
     }
-}
-
-// Narrows the leading ASCII units of FROM into TO; answers how many. The caller hands over one
-// block at a time, so the scan and the copy read the units from the cache, and the copy through
-// plain pointers is one the compiler widens to many units per step.
-size_t NarrowAscii(std::u16string_view from, char* to) noexcept {
-    const size_t ascii = qv::kern::AsciiPrefixLength(from);
-    const char16_t* const units = from.data();
-    for (size_t i = 0; i < ascii; ++i)
-        to[i] = static_cast<char>(units[i]);
-    return ascii;
 }
 
 } // namespace
@@ -258,44 +244,6 @@ std::u16string DecimalText(uint64_t value) {
         value /= 10;
     } while (value != 0);
     return text;
-}
-
-std::string ToUtf8(std::u16string_view text) {
-    // A whole document goes through here before Expat sees it, and markup is nearly all ASCII.
-    // The output is made ready one block at a time, so that its zero fill and the narrowing
-    // meet the same cache lines; the room for one byte per unit is reserved at once.
-    constexpr size_t kBlock = 16384;
-    std::string out;
-    out.reserve(text.size());
-    size_t i = 0;
-    while (i < text.size()) {
-        const size_t end = i + std::min(kBlock, text.size() - i);
-        size_t used = out.size();
-        out.resize(used + (end - i));
-        while (i < end) {
-            const size_t ascii = NarrowAscii(text.substr(i, end - i), out.data() + used);
-            used += ascii;
-            i += ascii;
-            if (i == end)
-                break;
-            char32_t code = text[i];
-            size_t units = 1;
-            if (code >= 0xD800 && code < 0xDC00 && i + 1 < text.size() && text[i + 1] >= 0xDC00 &&
-                text[i + 1] < 0xE000) {
-                code = 0x10000 + ((code - 0xD800) << 10) +
-                       (static_cast<char32_t>(text[i + 1]) - 0xDC00);
-                units = 2; // a pair may end one unit past the block
-            }
-            i += units;
-            // Room for this character's bytes and one byte for each unit left in the block.
-            const size_t needed = used + 4 + (i < end ? end - i : 0);
-            if (needed > out.size())
-                out.resize(std::max(needed, out.size() + out.size() / 2));
-            U8_APPEND_UNSAFE(out.data(), used, code);
-        }
-        out.resize(used);
-    }
-    return out;
 }
 
 std::u16string FromUtf8Lenient(std::string_view bytes) {

@@ -49,10 +49,6 @@ std::string JoinFilePath(const std::string& base, const std::string& relative);
 // The decimal text of VALUE.
 std::u16string DecimalText(uint64_t value);
 
-// Standard UTF-8 for a UTF-16 text (pairs become four bytes; a lone surrogate is written as its
-// three-byte form, which a strict reader rejects).
-std::string ToUtf8(std::u16string_view text);
-
 // UTF-16 for bytes that should be UTF-8; undecodable bytes become U+FFFD.
 std::u16string FromUtf8Lenient(std::string_view bytes);
 

@@ -1,4 +1,5 @@
 // The resource-tree builder: what a pending element becomes (node, text, link, include, capture).
+#include "kern/Utf8.h"
 #include "kern/osdep/OSException.h"
 #include "resource_tree/ListText.h"
 #include "resource_tree/ParseStack.h"
@@ -242,7 +243,7 @@ void ParseStack::ProcessInclude(Frame& frame, const std::u16string& path,
     const std::string& directory = context_.settings.includeDirectory.empty()
                                        ? HostDirectory()
                                        : context_.settings.includeDirectory;
-    const std::string file = JoinFilePath(directory, ToUtf8(path));
+    const std::string file = JoinFilePath(directory, qv::kern::WideToStandardUtf8(path));
     const bool asChild = !Equals(steering.what, u"children");
     ParseStack* const outer = context_.innermost;
     try {

@@ -1,4 +1,5 @@
 // Loading resource-tree documents into nodes: whole texts, files in blocks, deferred files.
+#include "kern/Utf8.h"
 #include "resource_tree/ListText.h"
 #include "resource_tree/ParseStack.h"
 
@@ -114,8 +115,9 @@ int32_t ResTreeNode::ParseText(std::u16string_view text, bool asChild, ResTreeNo
     LoadScope scope(settings, true);
     if (scope.IsTooDeep())
         return RefuseTooDeep(*this, scope, u"text");
-    return RunLoad(*this, scope, asChild, out, std::u16string(),
-                   [text](ParseStack& stack) { return stack.Parse(ToUtf8(text), true); });
+    return RunLoad(*this, scope, asChild, out, std::u16string(), [text](ParseStack& stack) {
+        return stack.Parse(qv::kern::WideToStandardUtf8(text), true);
+    });
 }
 
 int32_t ResTreeNode::ParseFile(const std::string& path, bool asChild, ResTreeNode** out,
@@ -160,7 +162,8 @@ int32_t ResTreeNode::LoadDeferred() {
                 parent_->LoadDeferred();
             continue;
         }
-        const int32_t result = ParseFile(JoinFilePath(directory, ToUtf8(piece)), false);
+        const int32_t result =
+            ParseFile(JoinFilePath(directory, qv::kern::WideToStandardUtf8(piece)), false);
         if (result != kOk)
             return result;
     }

@@ -3,6 +3,7 @@
 
 #include "host/UiLanguage.h"
 #include "kern/Collate.h"
+#include "kern/Utf8.h"
 #include "resource_tree/ListText.h"
 #include "resource_tree/LoadContext.h"
 #include "resource_tree/LoaderText.h"
@@ -30,7 +31,7 @@ bool IsNameChar(char16_t c) noexcept {
 // are checked by letting it read an element of that name.
 bool ParserAcceptsName(std::u16string_view name) {
     std::string element(1, '<');
-    element += ToUtf8(name);
+    element += qv::kern::WideToStandardUtf8(name);
     element += "/>";
     XML_Parser parser = XML_ParserCreate("UTF-8");
     if (parser == nullptr)

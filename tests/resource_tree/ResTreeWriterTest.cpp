@@ -2,6 +2,7 @@
 #include "resource_tree/ResTreeWriter.h"
 
 #include "TreeTestSupport.h"
+#include "kern/Utf8.h"
 #include "resource_tree/LoaderText.h"
 
 #include <cstdlib>
@@ -21,12 +22,12 @@ ResTreeDocument ExpectRoundTrip(const ResTreeNode& tree, std::u16string_view lan
     settings.language = std::u16string(language);
     int32_t result = -1;
     auto again = Load(written.xml, &settings, &result);
-    EXPECT_EQ(result, 0) << ToUtf8(written.xml);
+    EXPECT_EQ(result, 0) << qv::kern::WideToStandardUtf8(written.xml);
     std::u16string difference;
     EXPECT_TRUE(EqualResTrees(tree, *again, &difference))
-        << ToUtf8(difference) << "\n"
-        << ToUtf8(written.xml) << "\nloaded back as\n"
-        << ToUtf8(WriteResTree(*again, language).xml);
+        << qv::kern::WideToStandardUtf8(difference) << "\n"
+        << qv::kern::WideToStandardUtf8(written.xml) << "\nloaded back as\n"
+        << qv::kern::WideToStandardUtf8(WriteResTree(*again, language).xml);
     return written;
 }
 
@@ -59,7 +60,7 @@ TEST(ResTreeWriter, LoadedDocumentsRoundTrip) {
     for (const std::u16string& doc : documents) {
         auto tree = Load(doc);
         const ResTreeDocument written = ExpectRoundTrip(*tree);
-        EXPECT_TRUE(written.faithful) << ToUtf8(written.xml);
+        EXPECT_TRUE(written.faithful) << qv::kern::WideToStandardUtf8(written.xml);
         // Writing is stable: the second generation reads the same.
         auto again = Load(written.xml);
         EXPECT_EQ(WriteResTree(*again, u"eng").xml, written.xml);
@@ -111,7 +112,8 @@ TEST(ResTreeWriter, EqualityNoticesEveryKindOfDifference) {
          }) {
         auto tree = Load(other);
         std::u16string difference;
-        EXPECT_FALSE(EqualResTrees(*base, *tree, &difference)) << ToUtf8(other);
+        EXPECT_FALSE(EqualResTrees(*base, *tree, &difference))
+            << qv::kern::WideToStandardUtf8(other);
         EXPECT_FALSE(difference.empty());
     }
 }

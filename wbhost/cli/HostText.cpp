@@ -1,6 +1,7 @@
 // Texts between the terminal, the host's strings and UTF-16.
 #include "cli/HostText.h"
 
+#include "kern/Utf8.h"
 #include "runtime/Runtime.h"
 
 #include <cstring>
@@ -15,10 +16,7 @@ std::u16string FromUtf8(std::string_view text) {
 }
 
 std::string ToUtf8(std::u16string_view text) {
-    const icu::UnicodeString wide(text.data(), static_cast<int32_t>(text.size()));
-    std::string encoded;
-    wide.toUTF8String(encoded);
-    return encoded;
+    return qv::kern::WideToStandardUtf8(text, u'\uFFFD');
 }
 
 void HandleDisposer::operator()(void** handle) const noexcept {
