@@ -1,9 +1,8 @@
-// BSTR allocation, task memory and per-thread initialisation counts.
+// BSTR allocation, per-thread initialisation counts and GUID text.
 #include "com/Bstr.h"
 
 #include "com/ComGuid.h"
 #include "com/ComInit.h"
-#include "com/TaskMem.h"
 
 #include <gtest/gtest.h>
 #include <thread>
@@ -33,13 +32,6 @@ TEST(Bstr, NullAndEmptyAreDistinctButBothEmpty) {
     qv::com::UniqueBstr copy(SysAllocString(u"Tangent IO"));
     EXPECT_EQ(qv::com::BstrToString(copy.get()), u"Tangent IO");
     EXPECT_EQ(SysAllocStringLen(u"x", 0xFFFFFFFFu), nullptr); // the byte length cannot fit
-}
-
-TEST(TaskMem, ZeroSizeGivesAFreeableBlock) {
-    void* block = CoTaskMemAlloc(0);
-    EXPECT_NE(block, nullptr);
-    CoTaskMemFree(block);
-    CoTaskMemFree(nullptr);
 }
 
 TEST(ComInit, CountsPerThreadAndIgnoresUnbalancedUninitialize) {

@@ -194,29 +194,4 @@ TEST(ComPolyObject, AggregatedInterfacesCountOnTheOuterObject) {
     EXPECT_EQ(qv::com::LiveObjectCount(), before);
 }
 
-TEST(ComPtr, AdoptTakesOverShareAddsAndCopiesBalance) {
-    CQVComObject<Sample>* raw = nullptr;
-    ASSERT_EQ(CQVComObject<Sample>::CreateInstance(&raw), S_OK);
-    {
-        auto owner = ComPtr<IBeta>::Adopt(raw);
-        auto shared = ComPtr<IBeta>::Share(raw);
-        EXPECT_EQ(CountOf(raw->GetUnknown()), 2u);
-        ComPtr<IBeta> copy = shared;
-        ComPtr<IBeta> moved = std::move(copy);
-        EXPECT_FALSE(copy);
-        EXPECT_EQ(CountOf(raw->GetUnknown()), 3u);
-        copy = moved;
-        EXPECT_EQ(CountOf(raw->GetUnknown()), 4u);
-        IBeta* out = nullptr;
-        moved.CopyTo(&out);
-        EXPECT_EQ(CountOf(raw->GetUnknown()), 5u);
-        auto adopted = ComPtr<IBeta>::Adopt(out);
-        IBeta* detached = adopted.Detach();
-        EXPECT_EQ(CountOf(raw->GetUnknown()), 5u);
-        detached->Release();
-        EXPECT_EQ(ComPtr<IAlpha>().As<IBeta>().Get(), nullptr);
-    }
-    // Every reference above was balanced: the object is gone, which ASan would report otherwise.
-}
-
 } // namespace

@@ -145,16 +145,28 @@ TEST(ResTreeObservers, WatchingSurvivesAnyTeardownOrder) {
     for (const bool reserverFirst : {true, false}) {
         auto root = test::NewRoot();
         root->SetOrdered(true);
-        root->AddChild(root->End(), u"target", u"IOResource", false);
+        ResTreeNode* target = root->AddChild(root->End(), u"target", u"IOResource", false).node;
         ResTreeNode* user = root->AddChild(reserverFirst ? root->Begin() : root->End(), u"user",
                                            u"IOResource", false)
                                 .node;
         user->SetText(u"Reserves", u"../target");
         Recorder onUser;
         user->AddObserver(&onUser, kReservationChanged, 0);
+        target->RaiseChanges(kReservationChanged);
+        ASSERT_EQ(onUser.All(), kReservationChanged) << reserverFirst;
         root->RemoveByName(reserverFirst ? u"user" : u"target");
+        onUser.calls.clear();
+        if (reserverFirst) {
+            // The reserver is gone: its target's changes reach nobody.
+            target->RaiseChanges(kReservationChanged);
+            EXPECT_TRUE(onUser.calls.empty());
+        } else {
+            // The target is gone: the reserver still hears its own changes.
+            user->RaiseChanges(kReservationChanged);
+            EXPECT_EQ(onUser.All(), kReservationChanged);
+        }
         root->AddText(root->End(), u"after", u"");
-        root.reset(); // the sanitizers tell if anything was left dangling
+        root.reset(); // and the sanitizers tell if anything was left dangling
     }
 }
 

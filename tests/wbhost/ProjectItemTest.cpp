@@ -62,22 +62,6 @@ TEST_F(ProjectItemTest, TreeOperations) {
     EXPECT_EQ(NameOf(inner.Get()), u"Renamed");
     // Duplicate names are the plug-in's business: the host accepts them.
     EXPECT_TRUE(Child(root, u"folder"));
-
-    uint32_t flags = 0;
-    EXPECT_EQ(inner->GetFlags(&flags), S_OK);
-    EXPECT_EQ(flags, wbproj::kShownFlag);
-    inner->SetFlags(flags & ~wbproj::kShownFlag);
-    inner->GetFlags(&flags);
-    EXPECT_EQ(flags, 0u);
-
-    inner->Refresh(wbproj::kUpdateRenamed);
-    inner->Refresh(wbproj::kUpdateStatus);
-    inner->Select();
-    inner->Show(1);
-    const auto& host = static_cast<wbhost::project::ProjectItem&>(*inner.Get());
-    EXPECT_EQ(host.Refreshes(), (std::vector<uint32_t>{512, 516}));
-    EXPECT_EQ(host.SelectCount(), 1);
-    EXPECT_EQ(host.LastShow(), 1);
 }
 
 TEST_F(ProjectItemTest, InfoRecordAndObjectMap) {

