@@ -1,11 +1,11 @@
 // The text helpers, called through the loaded module with host strings that the embedded host's
 // runtime allocates, as a host program hands them over.
 #include "LoadedModule.h"
+#include "runtime/HostStrings.h"
 #include "runtime/Runtime.h"
 
 #include <cstdint>
 #include <cstdlib>
-#include <cstring>
 #include <gtest/gtest.h>
 #include <string>
 
@@ -16,25 +16,18 @@ using WcsWcs = int32_t(WBHandle, WBHandle);
 using McbOffsets = void(WBHandle, int32_t*, int32_t*);
 using IsInvalidChar = uint8_t(WBHandle, const char*);
 
-// A host string block owned by the test, made and resized by the host runtime.
+// A host string owned by the test, made and resized by the host runtime.
 class HostText {
 public:
     explicit HostText(std::string_view bytes) {
-        EXPECT_EQ(NumericArrayResize(kWBTypeU8, 1, &handle_, bytes.size()), 0);
-        const auto count = static_cast<int32_t>(bytes.size());
-        std::memcpy(*handle_, &count, sizeof count);
-        std::memcpy(static_cast<char*>(*handle_) + sizeof count, bytes.data(), bytes.size());
+        EXPECT_EQ(wbhost::runtime::StoreHostString(&handle_, bytes), kWBNoErr);
     }
     ~HostText() { DSDisposeHandle(handle_); }
     HostText(const HostText&) = delete;
     HostText& operator=(const HostText&) = delete;
 
     WBHandle handle() const { return handle_; }
-    std::string bytes() const {
-        int32_t count = 0;
-        std::memcpy(&count, *handle_, sizeof count);
-        return std::string(static_cast<const char*>(*handle_) + sizeof count, count);
-    }
+    std::string bytes() const { return wbhost::runtime::ReadHostString(handle_).value_or("<bad>"); }
 
 private:
     WBHandle handle_ = nullptr;
