@@ -164,8 +164,10 @@ void ResourceTree::Deliver(const std::shared_ptr<NodeState>& state, uint32_t eve
         const bool stillRegistered = std::any_of(now.begin(), now.end(), [&](const auto& c) {
             return c.observer.Get() == r.observer.Get() && c.kind == r.kind;
         });
-        if (stillRegistered)
-            r.observer->OnNodeEvent(object.Get(), due, r.kind);
+        if (!stillRegistered)
+            continue;
+        ++notifications_;
+        r.observer->OnNodeEvent(object.Get(), due, r.kind);
     }
 }
 

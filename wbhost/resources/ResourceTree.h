@@ -98,6 +98,9 @@ public:
     // The reserving items other than EXCEPT (may be null), in order, without references added.
     std::vector<IwbProjectItem*> ReservingItems(wbhw::ResTreeNode& node, IwbProjectItem* except);
 
+    // How many observer calls the tree has made so far (for measurements).
+    uint64_t Notifications() const noexcept { return notifications_; }
+
     // Drops every observer and reservation (they hold references on items, which hold references
     // on nodes); the service calls it when it lets a tree go.
     void Shutdown();
@@ -130,6 +133,7 @@ private:
     mutable std::recursive_mutex mutex_;
     std::unique_ptr<wbhw::ResTreeNode> root_;
     std::unordered_map<const wbhw::ResTreeNode*, std::shared_ptr<NodeState>> states_;
+    uint64_t notifications_ = 0;
 };
 
 } // namespace wbhost::resources
