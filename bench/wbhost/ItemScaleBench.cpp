@@ -57,7 +57,7 @@ GUID NumberedGuid(uint32_t number) {
     return GUID{number, 0x5ca1, 0xe000, {0x8a, 0, 0, 0, 0, 0, 0, 1}};
 }
 
-// A project with the target DESCRIPTION and one item for each of its COUNT lines.
+// A project with the target DESCRIPTION and one item for each of its first COUNT lines.
 SavedProject ScaleProject(int count, const std::string& description) {
     SavedProject project;
     project.items.push_back({NumberedGuid(0),
@@ -97,15 +97,17 @@ SavedProject ScaleProject(int count, const std::string& description) {
 // The files of one size, written once per run into a folder removed at exit.
 class ScaleFiles {
 public:
-    explicit ScaleFiles(int count) {
+    // COUNT lines, and an item for each when WITHITEMS.
+    ScaleFiles(int count, bool withItems) {
         std::string pattern = (fs::temp_directory_path() / "wbscale-XXXXXX").string();
         folder_ = mkdtemp(pattern.data()) != nullptr ? pattern : std::string();
         const std::string description = (fs::path(folder_) / "scale.xml").string();
         project_ = (fs::path(folder_) / "scale.wbproj").string();
-        ok_ = !folder_.empty() &&
-              wbhost::project::WriteFileAtomically(description, Description(count), nullptr) &&
-              wbhost::project::WriteFileAtomically(
-                  project_, FormatProject(ScaleProject(count, description)), nullptr);
+        ok_ =
+            !folder_.empty() &&
+            wbhost::project::WriteFileAtomically(description, Description(count), nullptr) &&
+            wbhost::project::WriteFileAtomically(
+                project_, FormatProject(ScaleProject(withItems ? count : 0, description)), nullptr);
     }
     ~ScaleFiles() {
         std::error_code ignored;
@@ -123,22 +125,25 @@ private:
     bool ok_ = false;
 };
 
-const ScaleFiles& FilesOf(int count) {
-    static std::map<int, std::unique_ptr<ScaleFiles>> files;
-    auto& slot = files[count];
+const ScaleFiles& FilesOf(int count, bool withItems) {
+    static std::map<std::pair<int, bool>, std::unique_ptr<ScaleFiles>> files;
+    auto& slot = files[{count, withItems}];
     if (!slot)
-        slot = std::make_unique<ScaleFiles>(count);
+        slot = std::make_unique<ScaleFiles>(count, withItems);
     return *slot;
 }
 
-// A session with the module loaded and the project of COUNT items open; null on failure.
-std::unique_ptr<wbhost::session::HostSession> OpenScaleProject(int count, double* seconds) {
+// A session with the module loaded and the project of COUNT lines open (with an item for each
+// when WITHITEMS); null on failure. SECONDS receives the processor time of the opening.
+std::unique_ptr<wbhost::session::HostSession> OpenScaleProject(int count, bool withItems,
+                                                               double* seconds) {
     auto session = std::make_unique<wbhost::session::HostSession>();
     std::string error;
-    if (!FilesOf(count).Ok() || !session->Open(WBT_MODULE_PATH, &error))
+    const ScaleFiles& files = FilesOf(count, withItems);
+    if (!files.Ok() || !session->Open(WBT_MODULE_PATH, &error))
         return nullptr;
     const double start = ThreadSeconds();
-    const bool opened = session->OpenProject(FilesOf(count).Project(), &error);
+    const bool opened = session->OpenProject(files.Project(), &error);
     if (seconds != nullptr)
         *seconds = ThreadSeconds() - start;
     return opened ? std::move(session) : nullptr;
@@ -160,9 +165,6 @@ double ItemsWith(wbhost::session::HostSession& session, int32_t status,
     return found;
 }
 
-// Processor seconds per item of every run, by measurement and item count.
-std::map<std::string, std::map<int, std::vector<double>>> g_perItem;
-
 double Median(std::vector<double> values) {
     if (values.empty())
         return 0;
@@ -171,84 +173,120 @@ double Median(std::vector<double> values) {
     return values.size() % 2 != 0 ? values[middle] : (values[middle - 1] + values[middle]) / 2;
 }
 
-// Records one run of WHAT over COUNT items that took SECONDS of processor time.
-void Record(benchmark::State& state, const std::string& what, int count, double seconds) {
-    auto& samples = g_perItem[what][count];
-    samples.push_back(seconds / count);
-    state.counters["median_us_per_item"] = Median(samples) * 1e6;
-}
+// Processor seconds per item (or line) at 1,000 and at 10,000, measured in pairs: each iteration
+// measures both sizes one after the other, so a change of the machine's load between runs does
+// not pass for a change of scale. The ratio is taken per pair and its median reported.
+struct Pairs {
+    std::vector<double> small;
+    std::vector<double> large;
+    std::vector<double> ratios;
+    void Add(double smallSeconds, double largeSeconds) {
+        small.push_back(smallSeconds / kSmall);
+        large.push_back(largeSeconds / kLarge);
+        ratios.push_back(large.back() / small.back());
+    }
+    void Report(benchmark::State& state) const {
+        state.counters["median_us_per_item_1000"] = Median(small) * 1e6;
+        state.counters["median_us_per_item_10000"] = Median(large) * 1e6;
+        state.counters["median_ratio"] = Median(ratios);
+    }
+};
+std::map<std::string, Pairs> g_pairs;
 
 void BM_OpenAndBind(benchmark::State& state) {
-    const int count = static_cast<int>(state.range(0));
+    Pairs& pairs = g_pairs["open and bind"];
     double bound = 0;
     for (auto _ : state) {
         state.PauseTiming();
-        double seconds = 0;
-        auto session = OpenScaleProject(count, &seconds);
-        if (!session) {
-            state.SkipWithError("the project does not open");
-            return;
+        double seconds[2] = {0, 0};
+        const bool smallFirst = state.iterations() % 2 == 0;
+        for (const int count : {smallFirst ? kSmall : kLarge, smallFirst ? kLarge : kSmall}) {
+            auto session = OpenScaleProject(count, true, &seconds[count == kLarge]);
+            if (!session) {
+                state.SkipWithError("the project does not open");
+                return;
+            }
+            bound += ItemsWith(*session, 0, u"/C0/");
         }
-        Record(state, "open and bind", count, seconds);
-        bound = ItemsWith(*session, 0, u"/C0/");
-        session.reset();
+        pairs.Add(seconds[0], seconds[1]);
         state.ResumeTiming();
     }
-    state.counters["items_bound"] = bound;
+    pairs.Report(state);
+    state.counters["items_bound_per_pair"] = bound / static_cast<double>(state.iterations());
 }
 
+// One project open for the connector renames: its tree, and which name the connector has now.
+struct RenameSubject {
+    std::unique_ptr<wbhost::session::HostSession> session;
+    wbhost::resources::ResourceTree* tree = nullptr;
+    bool renamed = false;
+
+    RenameSubject(int count, bool withItems)
+        : session(OpenScaleProject(count, withItems, nullptr)) {
+        if (session)
+            tree = session->Project()->TargetOf(TargetOf(*session))->Target().tree.get();
+    }
+    // Renames the connector back and forth; the processor seconds it took, or a negative number.
+    double Rename() {
+        wbhw::ResTreeNode* connector = tree->Find(renamed ? u"C1" : u"C0");
+        const double start = ThreadSeconds();
+        if (connector == nullptr || tree->Rename(*connector, renamed ? u"C0" : u"C1") != S_OK)
+            return -1;
+        renamed = !renamed;
+        return ThreadSeconds() - start;
+    }
+    // How many items now report the connector's current name in their bound resource.
+    double Following() { return ItemsWith(*session, 0, renamed ? u"/C1/" : u"/C0/"); }
+};
+
+// Renames the connector above 1,000 and 10,000 lines, with an item for each line when RANGE(0)
+// is 1; without items it shows what the host's tree alone costs.
 void BM_RenameConnector(benchmark::State& state) {
-    const int count = static_cast<int>(state.range(0));
-    auto session = OpenScaleProject(count, nullptr);
-    if (!session) {
+    const bool withItems = state.range(0) != 0;
+    RenameSubject small(kSmall, withItems);
+    RenameSubject large(kLarge, withItems);
+    if (small.tree == nullptr || large.tree == nullptr) {
         state.SkipWithError("the project does not open");
         return;
     }
-    wbhost::resources::ResourceTree& tree =
-        *session->Project()->TargetOf(TargetOf(*session))->Target().tree;
-    const uint64_t before = tree.Notifications();
-    bool renamed = false;
+    Pairs& pairs = g_pairs[withItems ? "rename the connector" : "rename the connector, no items"];
+    const uint64_t before = large.tree->Notifications();
+    bool smallFirst = true;
     for (auto _ : state) {
-        wbhw::ResTreeNode* connector = tree.Find(renamed ? u"C1" : u"C0");
-        const double start = ThreadSeconds();
-        if (connector == nullptr || tree.Rename(*connector, renamed ? u"C0" : u"C1") != S_OK) {
+        // Each size goes first every other time: the one measured second finds the caches
+        // filled by the other.
+        const double firstSeconds = smallFirst ? small.Rename() : large.Rename();
+        const double secondSeconds = smallFirst ? large.Rename() : small.Rename();
+        const double smallSeconds = smallFirst ? firstSeconds : secondSeconds;
+        const double largeSeconds = smallFirst ? secondSeconds : firstSeconds;
+        smallFirst = !smallFirst;
+        if (smallSeconds < 0 || largeSeconds < 0) {
             state.SkipWithError("the connector cannot be renamed");
             return;
         }
-        Record(state, "rename the connector", count, ThreadSeconds() - start);
-        renamed = !renamed;
+        pairs.Add(smallSeconds, largeSeconds);
     }
-    state.counters["notifications_per_rename"] =
-        static_cast<double>(tree.Notifications() - before) /
+    pairs.Report(state);
+    state.counters["notifications_per_rename_10000"] =
+        static_cast<double>(large.tree->Notifications() - before) /
         static_cast<double>(state.iterations());
-    state.counters["items_following"] = ItemsWith(*session, 0, renamed ? u"/C1/" : u"/C0/");
+    state.counters["items_following_10000"] = large.Following();
 }
 
-// Few runs, each long: the medians of the runs are what the summary compares.
-BENCHMARK(BM_OpenAndBind)->Arg(kSmall)->Arg(kLarge)->Unit(benchmark::kMillisecond)->Iterations(5);
-BENCHMARK(BM_RenameConnector)
-    ->Arg(kSmall)
-    ->Arg(kLarge)
-    ->Unit(benchmark::kMillisecond)
-    ->Iterations(6);
+// Few iterations, each long; the medians of the pairs are what the summary compares.
+BENCHMARK(BM_OpenAndBind)->Unit(benchmark::kMillisecond)->Iterations(6);
+BENCHMARK(BM_RenameConnector)->Arg(0)->Arg(1)->Unit(benchmark::kMillisecond)->Iterations(10);
 
 } // namespace
 
 int main(int argc, char** argv) {
     benchmark::Initialize(&argc, argv);
     benchmark::RunSpecifiedBenchmarks();
-    for (const auto& [what, bySize] : g_perItem) {
-        const auto small = bySize.find(kSmall);
-        const auto large = bySize.find(kLarge);
-        if (small == bySize.end() || large == bySize.end())
-            continue;
-        const double smallMedian = Median(small->second);
-        const double largeMedian = Median(large->second);
-        std::printf("%s: median processor time per item %.2f us at 1,000 items, %.2f us at "
-                    "10,000; ratio %.3f\n",
-                    what.c_str(), smallMedian * 1e6, largeMedian * 1e6,
-                    smallMedian > 0 ? largeMedian / smallMedian : 0.0);
-    }
+    for (const auto& [what, pairs] : g_pairs)
+        std::printf("%s: median processor time per item %.2f us at 1,000, %.2f us at 10,000; "
+                    "median ratio of pairs %.3f\n",
+                    what.c_str(), Median(pairs.small) * 1e6, Median(pairs.large) * 1e6,
+                    Median(pairs.ratios));
     benchmark::Shutdown();
     return 0;
 }
