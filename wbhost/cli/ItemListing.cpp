@@ -3,6 +3,7 @@
 
 #include "cli/AttributeSet.h"
 #include "cli/HostText.h"
+#include "cli/ItemStates.h"
 #include "kern/GuidText.h"
 #include "provider/TIOIdentifiers.h"
 
@@ -77,16 +78,10 @@ std::string ItemTypeName(const GUID& type) {
 }
 
 std::string ResourceStatusText(int32_t status) {
-    switch (status) {
-    case 0:
-        return "bound";
-    case 1:
-        return "missing";
-    case 2:
+    if (status == 2)
         return "held by another item";
-    default:
-        return "status " + std::to_string(status);
-    }
+    const std::string_view word = StatusWord(status);
+    return word.empty() ? "status " + std::to_string(status) : std::string(word);
 }
 
 void PrintItemTree(const project::ProjectItem& item, std::ostream& out, int depth) {
