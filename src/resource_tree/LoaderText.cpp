@@ -2,6 +2,7 @@
 // platform paths and the UTF-8 form handed to Expat.
 #include "resource_tree/LoaderText.h"
 
+#include "host/HostFolder.h"
 #include "resource_tree/ExPatHandler.h"
 #include "resource_tree/ListText.h"
 
@@ -97,8 +98,11 @@ bool HasHostExecutable(const std::string& directory) {
 std::string FindHostDirectory() {
     const std::string exe = ExecutablePath();
     std::string directory = DirectoryOf(exe);
-    if (exe.substr(exe.find_last_of('/') + 1) != "wbfpga_make_resource_cache")
-        return directory;
+    if (exe.substr(exe.find_last_of('/') + 1) != "wbfpga_make_resource_cache") {
+        // A host installed in one folder answers its executable's folder here; one whose shared
+        // files live elsewhere (an embedded host told so on its command line) answers that.
+        return qv::host::AskHostFolder().value_or(directory);
+    }
     // The cache builder runs from a tool folder below the host; the host is the nearest
     // directory above it that holds one of the host executables.
     for (std::string at = directory;;) {
@@ -257,8 +261,9 @@ const std::string& HostDirectory() {
     return directory;
 }
 
-const std::string& ExecutableDirectory() {
-    static const std::string directory = DirectoryOf(ExecutablePath());
+const std::string& DeferredDirectory() {
+    static const std::string directory =
+        qv::host::AskHostFolder().value_or(DirectoryOf(ExecutablePath()));
     return directory;
 }
 

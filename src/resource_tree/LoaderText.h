@@ -52,9 +52,11 @@ std::u16string DecimalText(uint64_t value);
 // UTF-16 for bytes that should be UTF-8; undecodable bytes become U+FFFD.
 std::u16string FromUtf8Lenient(std::string_view bytes);
 
-// The directory that ":Include" paths are relative to, worked out once per process.
+// The directory that ":Include" paths are relative to, worked out once per process: the host
+// folder that the host runtime tells (the executable's directory when there is no runtime).
 const std::string& HostDirectory();
-// The directory of the running executable.
-const std::string& ExecutableDirectory();
+// The directory that ":DeferredLoadPath" files are relative to, worked out once per process: the
+// host folder that the host runtime tells, else the directory of the running executable.
+const std::string& DeferredDirectory();
 
 } // namespace wbhw

@@ -154,7 +154,7 @@ int32_t ResTreeNode::LoadDeferred() {
     RemoveAt(found);
     LoadScope scope(nullptr, false);
     const std::string directory = scope.Context().settings.deferredDirectory.empty()
-                                      ? ExecutableDirectory()
+                                      ? DeferredDirectory()
                                       : scope.Context().settings.deferredDirectory;
     for (const std::u16string& piece : pieces) {
         if (piece == u"..") {

@@ -1,6 +1,7 @@
 // The path functions of the host runtime. Paths are this host's own '/' paths; the text form
 // and the file-system form are the same text. Output slots hold null (a new object is made) or
 // a live object of the right kind (it is reused); anything else is refused with kWBArgErr.
+#include "runtime/HostFolder.h"
 #include "runtime/HostStrings.h"
 #include "runtime/PathTable.h"
 #include "runtime/Runtime.h"
@@ -201,13 +202,12 @@ WBErr FGetSpecialDir(int32_t kind, WBPath* directory) {
     if (kind != kWBHostFolder) {
         return kWBArgErr;
     }
-    std::error_code error;
-    const fs::path executable = fs::read_symlink("/proc/self/exe", error);
-    if (error) {
+    const std::string folder = wbhost::runtime::HostFolder();
+    if (folder.empty()) {
         return kWBFileNotFound;
     }
     try {
-        return PathTable::Instance().Store(directory, executable.parent_path().string());
+        return PathTable::Instance().Store(directory, folder);
     } catch (const std::bad_alloc&) {
         return kWBMemFullErr;
     }

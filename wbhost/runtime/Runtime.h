@@ -34,8 +34,6 @@ inline constexpr WBErr kWBAttrMissing = kWBGenericErr;
 
 // Types of FIsAPathOfType.
 enum : int32_t { kWBAbsolutePath = 0, kWBRelativePath = 1, kWBEmptyPath = 2 };
-// The special folder of FGetSpecialDir that this host has: its own folder (the executable's).
-inline constexpr int32_t kWBHostFolder = 4;
 
 WBRT_EXPORT TargetItemFromAppRefFn TargetItemFromAppRef;
 WBRT_EXPORT ControlOnlineHelpFn ControlOnlineHelp;

@@ -112,6 +112,8 @@ typedef int32_t FIsAPathOfTypeFn(WBPath path, int32_t type);
 typedef int32_t FileInArchiveFn(WBPath path);
 typedef int32_t FileInWBLibpFn(WBPath path);
 typedef WBErr FPathToDSStringFn(WBPath path, WBHandle* text);
+// The special folder of FGetSpecialDir that modules ask for: the host's own folder.
+enum : int32_t { kWBHostFolder = 4 };
 typedef WBErr FGetSpecialDirFn(int32_t kind, WBPath* directory);
 typedef WBErr FPathToFileSystemDSStringFn(WBPath path, WBHandle* text);
 typedef WBErr FCopyFn(WBPath from, WBPath to);

@@ -1,0 +1,41 @@
+// The host's own folder, asked of the host runtime.
+#include "host/HostFolder.h"
+
+#include "host/HostString.h"
+#include "host/binding/HostFunctions.h"
+
+namespace qv::host {
+
+std::optional<std::string> AskHostFolder() noexcept {
+    // Bound without the fatal path: a process without a host runtime (a tool, a test) simply
+    // has no host folder to tell.
+    auto* const special = rt::FGetSpecialDir.TryAddress();
+    auto* const toText = rt::FPathToFileSystemDSString.TryAddress();
+    auto* const destroy = rt::FDestroyPath.TryAddress();
+    auto* const dispose = rt::DSDisposeHandle.TryAddress();
+    if (special == nullptr || toText == nullptr || destroy == nullptr || dispose == nullptr)
+        return std::nullopt;
+    WBPath folder = nullptr;
+    if (special(kWBHostFolder, &folder) != kWBNoErr || folder == nullptr) {
+        if (folder != nullptr)
+            destroy(&folder);
+        return std::nullopt;
+    }
+    WBHandle text = nullptr;
+    const WBErr converted = toText(folder, &text);
+    destroy(&folder);
+    std::optional<std::string> answer;
+    try {
+        if (converted == kWBNoErr && text != nullptr)
+            answer = ReadHostString(text);
+    } catch (...) {
+        answer.reset();
+    }
+    if (text != nullptr)
+        dispose(text);
+    if (answer && answer->empty())
+        answer.reset();
+    return answer;
+}
+
+} // namespace qv::host
