@@ -19,9 +19,11 @@ TEST(CliAnswers, RefusesMisspeltBehavioursAndMalformedTextsWithoutSettingAnythin
     std::string error;
     // A behaviour nobody runs would be accepted by the session and never used.
     EXPECT_FALSE(AddAnswer("select-resorce:0=1", session, error));
-    EXPECT_NE(error.find("no program behaviour is called \"select-resorce\""), std::string::npos);
+    EXPECT_EQ(error, "answer \"select-resorce:0=1\": no program behaviour has that name");
+    // Terminals run from 0 to 15: an answer for output 200 would be printed and never read.
     for (const char* bad : {"select-resource", "select-resource:0", ":0=1", "select-resource:x=1",
-                            "select-resource:0=maybe", "select-resource:0="}) {
+                            "select-resource:0=maybe", "select-resource:0=",
+                            "select-resource:16=1", "select-resource:200=1"}) {
         error.clear();
         EXPECT_FALSE(AddAnswer(bad, session, error)) << bad;
         EXPECT_FALSE(error.empty()) << bad;
@@ -46,15 +48,20 @@ TEST(CliAnswers, FilesSkipCommentsAndBlanksAndNameTheBadLine) {
     EXPECT_EQ(session.AnswersFor("select-resource").at(1),
               ProgramValue(std::u16string(u"Connector0/DIO1")));
 
-    const std::string bad =
-        scratch.Write("bad.txt", "explain-error:0=1\n# fine so far\nexplain-error 0=1\n");
+    // A byte-order mark is no part of the first answer; a bad line is named by its number and
+    // its reason, never echoed (the file may be anything the user named).
+    const std::string bad = scratch.Write(
+        "bad.txt", "\xEF\xBB\xBF" "explain-error:0=1\n# fine so far\nexplain-error secret=1\n");
     EXPECT_FALSE(LoadAnswerFile(bad, session, error));
-    EXPECT_EQ(error.rfind(bad + ": line 3: ", 0), 0u) << error;
+    EXPECT_EQ(error, bad + ": line 3: not of the form behaviour:index=value");
     EXPECT_EQ(session.AnswersFor("explain-error").at(0), ProgramValue(1));
 
     EXPECT_FALSE(LoadAnswerFile(scratch.File("missing.txt"), session, error));
     EXPECT_NE(error.find("cannot read the answer file"), std::string::npos);
     EXPECT_FALSE(LoadAnswerFile(scratch.Path(), session, error));
+    EXPECT_NE(error.find("it is a folder"), std::string::npos) << error;
+    EXPECT_FALSE(LoadAnswerFile("/dev/zero", session, error));
+    EXPECT_NE(error.find("not a regular file"), std::string::npos) << error;
 }
 
 TEST(CliAnswers, SingleAnswersOverrideTheFiles) {

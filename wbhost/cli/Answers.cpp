@@ -3,6 +3,7 @@
 
 #include "cli/HostText.h"
 #include "project/AtomicFile.h"
+#include "resources/InputFile.h"
 #include "runner/Behaviours.h"
 
 #include <filesystem>
@@ -43,47 +44,44 @@ void PrintTerminals(const char* label, const runner::Terminals& terminals, std::
         out << "    " << index << " = " << DescribeValue(value) << "\n";
 }
 
+// Why the answer TEXT cannot be set in SESSION; empty once it is set. The reason never repeats
+// the text: an answer file's lines may come from any file the user named.
+std::string SetAnswer(std::string_view text, runner::ProgramSession& session) {
+    const size_t colon = text.find(':');
+    if (colon == std::string_view::npos || text.find('=', colon) == std::string_view::npos)
+        return "not of the form behaviour:index=value";
+    if (!runner::IsKnownBehaviour(std::string(text.substr(0, colon))))
+        return "no program behaviour has that name";
+    if (!session.SetAnswerFromText(text))
+        return "the index must be a terminal number (0 to 15) and the value a 32-bit number, "
+               "text:... or list:a|b";
+    return {};
+}
+
 } // namespace
 
 bool AddAnswer(std::string_view text, runner::ProgramSession& session, std::string& error) {
-    const size_t colon = text.find(':');
-    const std::string behaviour(text.substr(0, colon));
-    if (colon == std::string_view::npos || text.find('=', colon) == std::string_view::npos) {
-        error = "answer \"" + std::string(text) + "\" is not of the form behaviour:index=value";
-        return false;
-    }
-    if (!runner::IsKnownBehaviour(behaviour)) {
-        error = "answer \"" + std::string(text) + "\": no program behaviour is called \"" +
-                behaviour + "\"";
-        return false;
-    }
-    if (!session.SetAnswerFromText(text)) {
-        error = "answer \"" + std::string(text) +
-                "\": the index must be a number and the value a 32-bit number, text:... or "
-                "list:a|b";
-        return false;
-    }
-    return true;
+    const std::string why = SetAnswer(text, session);
+    if (why.empty())
+        return true;
+    error = "answer \"" + std::string(text) + "\": " + why;
+    return false;
 }
 
 bool LoadAnswerFile(const std::string& path, runner::ProgramSession& session, std::string& error) {
     std::string content;
-    if (std::filesystem::is_directory(path)) {
-        error = "cannot read the answer file " + path + ": it is a folder";
-        return false;
-    }
     if (!project::ReadWholeFile(path, content, &error)) {
-        error = "cannot read the answer file " + path + ": " + error;
+        error = "cannot read the answer file " + error;
         return false;
     }
-    std::istringstream lines(content);
+    std::istringstream lines{std::string(resources::WithoutByteOrderMark(content))};
     std::string line;
     for (int number = 1; std::getline(lines, line); ++number) {
         const std::string_view text = Trim(line);
         if (text.empty() || text.front() == '#')
             continue;
-        if (!AddAnswer(text, session, error)) {
-            error = path + ": line " + std::to_string(number) + ": " + error;
+        if (const std::string why = SetAnswer(text, session); !why.empty()) {
+            error = path + ": line " + std::to_string(number) + ": " + why;
             return false;
         }
     }

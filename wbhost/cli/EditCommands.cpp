@@ -6,6 +6,7 @@
 #include "cli/ItemStates.h"
 #include "project/AtomicFile.h"
 #include "resource_tree/ResTreeWriter.h"
+#include "resources/InputFile.h"
 
 #include <filesystem>
 #include <optional>
@@ -76,10 +77,10 @@ bool ApplyEdit(resources::ResourceTree& tree, const EditRequest& request, std::o
         std::string document;
         std::string error;
         if (!project::ReadWholeFile(request.argument, document, &error)) {
-            err << "wbhost: cannot read " << request.argument << ": " << error << "\n";
+            err << "wbhost: cannot read " << error << "\n";
             return false;
         }
-        if (FAILED(tree.InsertSubTree(*node, FromUtf8(document)))) {
+        if (FAILED(tree.InsertSubTree(*node, resources::DecodeDocument(document)))) {
             err << "wbhost: " << request.argument
                 << " does not load as a resource-tree document; nothing was inserted\n";
             return false;

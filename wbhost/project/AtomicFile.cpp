@@ -1,11 +1,11 @@
 // Atomic file replacement over POSIX calls.
 #include "project/AtomicFile.h"
 
+#include "resources/InputFile.h"
+
 #include <cerrno>
 #include <cstring>
 #include <fcntl.h>
-#include <fstream>
-#include <sstream>
 #include <sys/stat.h>
 #include <unistd.h>
 
@@ -114,15 +114,12 @@ bool WriteFileAtomically(const std::string& path, std::string_view content, std:
 }
 
 bool ReadWholeFile(const std::string& path, std::string& content, std::string* error) {
-    std::ifstream in(path, std::ios::binary);
-    if (!in)
-        return Fail(error, "cannot open", path);
-    std::ostringstream bytes;
-    bytes << in.rdbuf();
-    if (in.bad())
-        return Fail(error, "cannot read", path);
-    content = std::move(bytes).str();
-    return true;
+    std::string why;
+    if (resources::ReadInputFile(path, content, why))
+        return true;
+    if (error != nullptr)
+        *error = std::move(why);
+    return false;
 }
 
 } // namespace wbhost::project

@@ -17,7 +17,8 @@ std::string TemporaryFileFor(const std::string& path);
 // (may be null) on any failure, after removing the temporary file.
 bool WriteFileAtomically(const std::string& path, std::string_view content, std::string* error,
                          const std::function<bool()>& beforeRename = {});
-// The bytes of the file PATH into CONTENT; false with a message in ERROR (may be null).
+// The bytes of the file PATH into CONTENT, read as every outside file is
+// (resources/InputFile.h); false with "PATH: reason" in ERROR (may be null).
 bool ReadWholeFile(const std::string& path, std::string& content, std::string* error);
 
 } // namespace wbhost::project

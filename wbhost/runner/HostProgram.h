@@ -15,8 +15,7 @@ namespace wbhost::runner {
 class HostProgramImpl : public IwbProgram {
 public:
     using Interfaces = qv::com::InterfaceList<IwbProgram>;
-    // Terminal indices a program may have (0 to 15).
-    static constexpr uint32_t kTerminalCount = 16;
+    static constexpr uint32_t kTerminalCount = runner::kTerminalCount;
 
     // The program in the file at PATH, read as FILE, running in SESSION.
     HostProgramImpl(std::shared_ptr<ProgramSession> session, std::string path, ProgramFile file);

@@ -49,7 +49,8 @@ bool ProgramSession::SetAnswerFromText(std::string_view text) {
     uint32_t index = 0;
     const auto [end, error] =
         std::from_chars(indexText.data(), indexText.data() + indexText.size(), index);
-    if (error != std::errc() || end != indexText.data() + indexText.size() || indexText.empty()) {
+    if (error != std::errc() || end != indexText.data() + indexText.size() || indexText.empty() ||
+        index >= kTerminalCount) {
         return false;
     }
     auto value = ParseValue(text.substr(equals + 1));

@@ -13,6 +13,9 @@
 
 namespace wbhost::runner {
 
+// Terminal indices a program may have (0 to 15).
+inline constexpr uint32_t kTerminalCount = 16;
+
 // A terminal value: a 32-bit value (also Booleans and statuses), a host reference, a text or a
 // list of texts.
 struct HostReference {
@@ -37,7 +40,7 @@ public:
     void SetAnswer(const std::string& behaviour, uint32_t index, ProgramValue value);
     // Reads an answer of the form "behaviour:index=value" (a list as "a|b|c" after "list:",
     // a text after "text:", else a 32-bit number), as the command line gives it. False, and
-    // nothing set, when the text does not have that form.
+    // nothing set, when the text does not have that form or the index is no terminal's.
     bool SetAnswerFromText(std::string_view text);
     // Forgets every answer.
     void ClearAnswers();
