@@ -1,11 +1,15 @@
 // wbhost: the embedded host on the command line.
 #include "cli/Commands.h"
+#include "cli/ControlEscaper.h"
 #include "cli/Demo.h"
 #include "cli/EditCommands.h"
+#include "cli/ExitStatus.h"
 #include "cli/ProgramCommand.h"
 #include "cli/ProjectCommands.h"
+#include "runtime/HostFolder.h"
 
 #include <CLI/CLI.hpp>
+#include <filesystem>
 #include <functional>
 #include <iostream>
 #include <string>
@@ -15,27 +19,81 @@
 #define WBT_MODULE_PATH "wbtangio.qxx"
 #endif
 
+#ifndef WBT_VERSION
+#define WBT_VERSION "0"
+#endif
+
 namespace {
 
 using wbhost::cli::HostOptions;
 
+constexpr const char* kModuleFileName = "wbtangio.qxx";
+
+constexpr const char* kExitStatuses =
+    "Exit status:\n"
+    "  0   done; compare: match; tree --check: no problems\n"
+    "  1   refused or failed; compare: not satisfied; tree --check: problems found\n"
+    "  2   compare: tolerated difference; tree --check: a file cannot be read\n"
+    "  3   compare could not run (a file, the module, a text the host cannot represent); an\n"
+    "      unexpected failure of any command\n"
+    "  64  the command line is wrong (unknown option, missing argument)";
+
+// The module an installed host finds beside itself; else the one this build made.
+std::string DefaultModulePath() {
+    std::error_code failed;
+    const auto executable = std::filesystem::read_symlink("/proc/self/exe", failed);
+    if (!failed) {
+        const auto beside = executable.parent_path() / kModuleFileName;
+        if (std::filesystem::is_regular_file(beside, failed))
+            return beside.string();
+    }
+    return WBT_MODULE_PATH;
+}
+
 // What the command line asked for; each subcommand's callback sets RUN to its work.
 struct Request {
-    HostOptions host{WBT_MODULE_PATH, {}, {}, false};
+    HostOptions host{DefaultModulePath(), {}, {}, false};
+    std::string hostFolder;
+    bool version = false;
     std::function<int()> run;
 };
 
 void AddTreeAndCompare(CLI::App& app, Request& request) {
     auto* tree = app.add_subcommand(
-        "tree", "load a target description, report its problems and print the dump of a node");
-    auto treeFile = std::make_shared<std::string>();
-    auto treePath = std::make_shared<std::string>();
-    tree->add_option("FILE", *treeFile, "a resource-tree document")->required();
-    tree->add_option("PATH", *treePath, "the node to dump (default: the root)");
-    tree->callback([&request, treeFile, treePath] {
-        request.run = [&request, treeFile, treePath] {
-            return wbhost::cli::RunTree(request.host.modulePath, *treeFile, *treePath, std::cout,
-                                        std::cerr);
+        "tree", "load a target description, report its problems and print the dump of a node; "
+                "with --check, report the problems of each FILE and print no dump");
+    tree->footer("  tree FILE [PATH]             the dump of the node at PATH (default: the root)\n"
+                 "  tree --check FILE...          FILE:LINE:COLUMN: error: MESSAGE lines, a "
+                 "summary;\n"
+                 "                               exit 0 clean, 1 problems, 2 a file not read");
+    struct TreeRequest {
+        std::vector<std::string> arguments;
+        bool check = false;
+        bool context = false;
+    };
+    auto treeRequest = std::make_shared<TreeRequest>();
+    tree->add_option("FILE", treeRequest->arguments,
+                     "a resource-tree document, then the path of the node to dump")
+        ->required();
+    tree->add_flag("--check", treeRequest->check, "only report the problems of every FILE");
+    tree->add_flag("--context", treeRequest->context,
+                   "with --check, show the input around each problem");
+    tree->callback([&request, treeRequest] {
+        const auto& arguments = treeRequest->arguments;
+        if (treeRequest->check) {
+            request.run = [treeRequest] {
+                return wbhost::cli::RunTreeCheck(treeRequest->arguments, treeRequest->context,
+                                                 std::cout, std::cerr);
+            };
+            return;
+        }
+        if (arguments.size() > 2 || treeRequest->context)
+            throw CLI::ValidationError("tree", "without --check: tree FILE [PATH]");
+        request.run = [&request, treeRequest] {
+            const auto& arguments = treeRequest->arguments;
+            return wbhost::cli::RunTree(request.host.modulePath, arguments[0],
+                                        arguments.size() > 1 ? arguments[1] : std::string(),
+                                        std::cout, std::cerr);
         };
     });
 
@@ -178,8 +236,11 @@ void AddDemo(CLI::App& app, Request& request) {
 } // namespace
 
 int main(int argc, char** argv) {
+    const wbhost::cli::ControlEscaper escapeOut(std::cout);
+    const wbhost::cli::ControlEscaper escapeErr(std::cerr);
     CLI::App app{"wbhost: an embedded host that loads the Tangent I/O module and drives it"};
-    app.require_subcommand(1);
+    app.require_subcommand(0, 1);
+    app.footer(kExitStatuses);
     // Options of the host may also follow the subcommand's own.
     app.fallthrough();
     Request request;
@@ -193,19 +254,42 @@ int main(int argc, char** argv) {
                    "text:... or list:a|b (overrides the files')")
         ->allow_extra_args(false);
     app.add_flag("--record", request.host.record, "print the programs' runs at the end");
+    app.add_option("--host-dir", request.hostFolder,
+                   "the host's folder: where included and deferred description files are "
+                   "looked up, and the host folder the module is told (default: the folder of "
+                   "the wbhost executable)")
+        ->type_name("DIR")
+        ->check(CLI::ExistingDirectory);
+    app.add_flag("--version", request.version,
+                 "print the host's version, the module file it loads and the module's GetInfo "
+                 "answer");
     AddTreeAndCompare(app, request);
     AddProject(app, request);
     AddEdit(app, request);
     AddProgram(app, request);
     AddDemo(app, request);
 
-    CLI11_PARSE(app, argc, argv);
     try {
-        return request.run ? request.run() : 1;
+        app.parse(argc, argv);
+    } catch (const CLI::ParseError& e) {
+        // Help asked for is a success; anything else CLI11 refuses is a usage error.
+        return app.exit(e) == 0 ? wbhost::cli::kExitOk : wbhost::cli::kExitUsage;
+    }
+    if (!request.hostFolder.empty())
+        wbhost::runtime::SetHostFolder(request.hostFolder);
+    try {
+        if (request.version)
+            return wbhost::cli::RunVersion(WBT_VERSION, request.host.modulePath, std::cout,
+                                           std::cerr);
+        if (!request.run) {
+            std::cerr << "wbhost: a command is required\nRun with --help for more information.\n";
+            return wbhost::cli::kExitUsage;
+        }
+        return request.run();
     } catch (const std::exception& e) {
         std::cerr << "wbhost: " << e.what() << "\n";
     } catch (...) {
         std::cerr << "wbhost: unexpected failure\n";
     }
-    return 3;
+    return wbhost::cli::kExitCannotRun;
 }

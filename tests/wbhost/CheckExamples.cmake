@@ -30,7 +30,7 @@ expect_all("${ERR}" "no node at \"Connector0/DIO8\"")
 file(MAKE_DIRECTORY ${SCRATCH})
 file(WRITE ${SCRATCH}/broken.xml "<Target name=\"Broken\">\n  <Line>1</Lin>\n</Target>\n")
 run_wbhost(1 tree ${SCRATCH}/broken.xml)
-expect_all("${ERR}" "Error on line 2" "mismatched tag")
+expect_all("${ERR}" "broken.xml:2:11: error: mismatched tag")
 expect_all("${OUT}" "<Target name=\"Broken\">")
 
 run_wbhost(1 tree ${SCRATCH}/missing.xml)

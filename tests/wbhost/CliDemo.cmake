@@ -36,7 +36,7 @@ run_wbhost(0 program TIOSelectResourceDialog.gx --answers ${SCRATCH}/answers.txt
            --answer select-resource:2=1 --record)
 expect_all("${OUT}" "1 = \"DIO5\"" "2 = 1" "-- program runs" "TIOSelectResourceDialog.gx (select-resource)")
 run_wbhost(1 --answer nosuch:0=1 project list ${project})
-expect_all("${ERR}" "no program behaviour is called \"nosuch\"")
+expect_all("${ERR}" "answer \"nosuch:0=1\": no program behaviour has that name")
 
 run_wbhost(0 --help)
 expect_all("${OUT}" "project" "edit" "program" "demo" "--answers" "--record")

@@ -1,41 +1,72 @@
 // The work behind wbhost's subcommands.
 #include "cli/Commands.h"
 
+#include "cli/ExitStatus.h"
+#include "cli/HostOptions.h"
 #include "cli/HostText.h"
 #include "cli/HostedModule.h"
+#include "cli/ProblemLines.h"
 #include "host/binding/runtime_api.h"
 #include "kern/CodePage.h"
 #include "project/HexStatus.h"
+#include "resource_tree/ResTreeWriter.h"
+#include "resources/InputFile.h"
 #include "resources/ResourceService.h"
 
 #include <cstdint>
-#include <fstream>
+#include <mutex>
 #include <optional>
 #include <ostream>
-#include <sstream>
 
 namespace wbhost::cli {
 namespace {
 
 using DumpFn = int32_t(const WBRefNum*, WBHandle, WBHandle, uint8_t*);
 using CompareFn = uint32_t(const char*, const char*);
+using InfoFn = int32_t();
 
-// The whole file PATH, or nothing when it cannot be read.
-std::optional<std::string> ReadFile(const std::string& path) {
-    std::ifstream in(path, std::ios::binary);
-    if (!in)
-        return std::nullopt;
-    std::ostringstream content;
-    content << in.rdbuf();
-    if (in.bad())
-        return std::nullopt;
-    return content.str();
+// The problems TARGET's load recorded, one line each.
+std::vector<ProblemLine> ProblemsOf(const resources::Target& target, const std::string& file) {
+    std::vector<ProblemLine> lines;
+    for (const auto& problem : target.problems) {
+        auto split = SplitProblems(ToUtf8(problem.message), file);
+        lines.insert(lines.end(), split.begin(), split.end());
+    }
+    return lines;
 }
 
-// Host programs hand the module multibyte text in the system's code page; descriptions and
-// command lines are UTF-8.
-std::string ToHostText(const std::string& utf8) {
-    return qv::kern::WideToAnsi(FromUtf8(utf8));
+// Names on ERR the characters of TARGET's tree that the host's code page cannot represent, and
+// so that a dump handed over in it shows as "?".
+void WarnOfLostCharacters(resources::Target& target, const std::string& file, std::ostream& err) {
+    const wbhw::ResTreeDocument document = [&] {
+        const std::lock_guard hold(target.tree->Mutex());
+        return wbhw::WriteResTree(target.tree->Root());
+    }();
+    const std::vector<char32_t> lost = CharactersTheHostCannotKeep(document.xml);
+    if (!lost.empty())
+        err << "warning: " << file << ": the host's code page (" << HostCodePage()
+            << ") cannot represent " << DescribeCharacters(lost) << "; the dump shows \"?\"\n";
+}
+
+// The description in FILE, decoded as the loader decodes a file; nothing, with the reason on
+// ERR, when it cannot be read or holds characters the host's code page cannot represent (the
+// module would compare "?" with "?" and answer as if they were the same).
+std::optional<std::string> ReadDescriptionForModule(const std::string& file, std::ostream& err) {
+    std::string bytes;
+    std::string error;
+    if (!resources::ReadInputFile(file, bytes, error)) {
+        err << "wbhost: cannot read " << error << "\n";
+        return std::nullopt;
+    }
+    const std::u16string text = resources::DecodeDocument(bytes);
+    const std::vector<char32_t> lost = CharactersTheHostCannotKeep(text);
+    if (!lost.empty()) {
+        err << "wbhost: " << file << ": the host's code page (" << HostCodePage()
+            << ") cannot represent " << DescribeCharacters(lost)
+            << "; the module would compare them as \"?\", so there is no answer\n";
+        return std::nullopt;
+    }
+    return qv::kern::WideToAnsi(text);
 }
 
 } // namespace
@@ -45,40 +76,74 @@ int RunTree(const std::string& modulePath, const std::string& file, const std::s
     HostedModule module(modulePath);
     if (!module.Loaded()) {
         err << "wbhost: " << module.Error() << "\n";
-        return kTreeFailed;
+        return kExitFailed;
     }
     auto* dump = module.Find<DumpFn>("TIOResTree_Dump");
     if (dump == nullptr) {
         err << "wbhost: the module does not export TIOResTree_Dump\n";
-        return kTreeFailed;
+        return kExitFailed;
     }
+    std::string error;
     resources::ResourceService service;
-    const resources::Target* target = service.LoadTargetFile(file);
+    resources::Target* const target =
+        resources::CheckInputFile(file, error) ? service.LoadTargetFile(file) : nullptr;
     if (target == nullptr) {
-        err << "wbhost: cannot read the target description " << file << "\n";
-        return kTreeFailed;
+        err << "wbhost: cannot read the target description " << (error.empty() ? file : error)
+            << "\n";
+        return kExitFailed;
     }
-    for (const auto& problem : target->problems)
-        err << file << ": " << ToUtf8(problem.path) << ": " << ToUtf8(problem.message) << "\n";
+    for (const ProblemLine& problem : ProblemsOf(*target, file))
+        err << FormatProblem(problem, false);
 
     const OwnedHandle pathText = NewHostString(ToHostText(path));
     const OwnedHandle dumpText = NewHostString("");
     if (!pathText || !dumpText) {
         err << "wbhost: out of host memory\n";
-        return kTreeFailed;
+        return kExitFailed;
     }
     uint8_t found = 0;
     const int32_t status = dump(&target->refnum, pathText.get(), dumpText.get(), &found);
     if (status < 0) {
         err << "wbhost: TIOResTree_Dump failed with status " << HexStatus(status) << "\n";
-        return kTreeFailed;
+        return kExitFailed;
     }
     if (found == 0) {
         err << "wbhost: no node at \"" << path << "\" in " << file << "\n";
-        return kTreeFailed;
+        return kExitFailed;
     }
     out << ToUtf8(qv::kern::AnsiToWide(HostStringBytes(dumpText.get())));
-    return target->problems.empty() ? kTreeOk : kTreeFailed;
+    WarnOfLostCharacters(*target, file, err);
+    return target->problems.empty() ? kExitOk : kExitFailed;
+}
+
+int RunTreeCheck(const std::vector<std::string>& files, bool context, std::ostream& out,
+                 std::ostream& err) {
+    size_t problems = 0;
+    size_t unreadable = 0;
+    for (const std::string& file : files) {
+        std::string error;
+        resources::ResourceService service;
+        const resources::Target* const target =
+            resources::CheckInputFile(file, error) ? service.LoadTargetFile(file) : nullptr;
+        if (target == nullptr) {
+            err << "wbhost: cannot read the target description " << (error.empty() ? file : error)
+                << "\n";
+            ++unreadable;
+            continue;
+        }
+        for (const ProblemLine& problem : ProblemsOf(*target, file)) {
+            out << FormatProblem(problem, context);
+            ++problems;
+        }
+    }
+    out << problems << (problems == 1 ? " problem" : " problems") << " in " << files.size()
+        << (files.size() == 1 ? " file" : " files");
+    if (unreadable > 0)
+        out << ", " << unreadable << " not read";
+    out << "\n";
+    if (unreadable > 0)
+        return kExitTolerated;
+    return problems == 0 ? kExitOk : kExitFailed;
 }
 
 int RunCompare(const std::string& modulePath, const std::string& required,
@@ -86,31 +151,45 @@ int RunCompare(const std::string& modulePath, const std::string& required,
     HostedModule module(modulePath);
     if (!module.Loaded()) {
         err << "wbhost: " << module.Error() << "\n";
-        return kCompareFailed;
+        return kExitCannotRun;
     }
     auto* compare = module.Find<CompareFn>("TIO_CompareTwoResourceTrees");
     if (compare == nullptr) {
         err << "wbhost: the module does not export TIO_CompareTwoResourceTrees\n";
-        return kCompareFailed;
+        return kExitCannotRun;
     }
-    const auto first = ReadFile(required);
-    const auto second = ReadFile(offered);
-    if (!first || !second) {
-        err << "wbhost: cannot read " << (first ? offered : required) << "\n";
-        return kCompareFailed;
-    }
-    const uint32_t result = compare(ToHostText(*first).c_str(), ToHostText(*second).c_str());
-    switch (result) {
+    const auto first = ReadDescriptionForModule(required, err);
+    const auto second = first ? ReadDescriptionForModule(offered, err) : std::nullopt;
+    if (!first || !second)
+        return kExitCannotRun;
+    switch (compare(first->c_str(), second->c_str())) {
     case 0:
         out << "match\n";
-        return 0;
+        return kExitOk;
     case 2:
         out << "tolerated difference\n";
-        return 2;
+        return kExitTolerated;
     default:
         out << "not satisfied\n";
-        return 1;
+        return kExitFailed;
     }
+}
+
+int RunVersion(const std::string& version, const std::string& modulePath, std::ostream& out,
+               std::ostream& err) {
+    out << "wbhost " << version << "\n";
+    HostedModule module(modulePath);
+    if (!module.Loaded()) {
+        err << "wbhost: " << module.Error() << "\n";
+        return kExitFailed;
+    }
+    auto* info = module.Find<InfoFn>("GetInfo");
+    if (info == nullptr) {
+        err << "wbhost: the module " << modulePath << " does not export GetInfo\n";
+        return kExitFailed;
+    }
+    out << "module " << AbsolutePath(modulePath) << " (GetInfo " << info() << ")\n";
+    return kExitOk;
 }
 
 } // namespace wbhost::cli
