@@ -3,7 +3,8 @@
 # 'apt-get update' at most once, and only when something has to be installed.
 set -euo pipefail
 packages=(cmake ninja-build g++ clang libclang-rt-14-dev libexpat1-dev libicu-dev
-          libcli11-dev libgtest-dev libgmock-dev libbenchmark-dev binutils nlohmann-json3-dev)
+          libcli11-dev libgtest-dev libgmock-dev libbenchmark-dev binutils nlohmann-json3-dev
+          dpkg-dev)
 missing=()
 for p in "${packages[@]}"; do
   dpkg-query -W -f='${Status}' "$p" 2>/dev/null | grep -q 'install ok installed' || missing+=("$p")

@@ -22,8 +22,8 @@ TEST(CliAnswers, RefusesMisspeltBehavioursAndMalformedTextsWithoutSettingAnythin
     EXPECT_EQ(error, "answer \"select-resorce:0=1\": no program behaviour has that name");
     // Terminals run from 0 to 15: an answer for output 200 would be printed and never read.
     for (const char* bad : {"select-resource", "select-resource:0", ":0=1", "select-resource:x=1",
-                            "select-resource:0=maybe", "select-resource:0=",
-                            "select-resource:16=1", "select-resource:200=1"}) {
+                            "select-resource:0=maybe", "select-resource:0=", "select-resource:16=1",
+                            "select-resource:200=1"}) {
         error.clear();
         EXPECT_FALSE(AddAnswer(bad, session, error)) << bad;
         EXPECT_FALSE(error.empty()) << bad;
@@ -50,8 +50,9 @@ TEST(CliAnswers, FilesSkipCommentsAndBlanksAndNameTheBadLine) {
 
     // A byte-order mark is no part of the first answer; a bad line is named by its number and
     // its reason, never echoed (the file may be anything the user named).
-    const std::string bad = scratch.Write(
-        "bad.txt", "\xEF\xBB\xBF" "explain-error:0=1\n# fine so far\nexplain-error secret=1\n");
+    const std::string bad =
+        scratch.Write("bad.txt", "\xEF\xBB\xBF"
+                                 "explain-error:0=1\n# fine so far\nexplain-error secret=1\n");
     EXPECT_FALSE(LoadAnswerFile(bad, session, error));
     EXPECT_EQ(error, bad + ": line 3: not of the form behaviour:index=value");
     EXPECT_EQ(session.AnswersFor("explain-error").at(0), ProgramValue(1));
