@@ -34,6 +34,10 @@ echo "  ..."
 echo
 run 0 tree examples/KestrelK40.xml Connector0/DIO3
 run 0 tree examples/KestrelK40.xml AnalogInputs/AI2
+# Every example, problems only; then the K-40 with its include (shared/KestrelTiming.xml)
+# looked up in examples/ itself instead of beside the executable.
+run 0 tree --check examples/KestrelK40.xml examples/KestrelK20.xml examples/KestrelK40X.xml
+run 0 --host-dir examples tree --check examples/KestrelK40.xml
 
 echo "== Comparing descriptions (required first, offered second)"
 run 0 compare examples/KestrelK40.xml examples/KestrelK40.xml
