@@ -67,9 +67,8 @@ void BM_LostCharacterCheck(benchmark::State& state) {
         benchmark::DoNotOptimize(wbhost::cli::CharactersTheHostCannotKeep(text));
     state.SetBytesProcessed(state.iterations() * static_cast<int64_t>(text.size() * 2));
     state.counters["vs_conversion"] =
-        SecondsPerRun([&] {
-            benchmark::DoNotOptimize(wbhost::cli::CharactersTheHostCannotKeep(text));
-        }) /
+        SecondsPerRun(
+            [&] { benchmark::DoNotOptimize(wbhost::cli::CharactersTheHostCannotKeep(text)); }) /
         SecondsPerRun([&] { benchmark::DoNotOptimize(qv::kern::WideToAnsi(text)); });
 }
 
