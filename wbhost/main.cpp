@@ -159,6 +159,21 @@ void AddProject(CLI::App& app, Request& request) {
             return wbhost::cli::RunAddItem(request.host, *path, *item, std::cout, std::cerr);
         };
     });
+
+    auto* remove = project->add_subcommand(
+        "remove-item", "remove an item (a folder with what is below it) from a target, as the "
+                       "project tree does, and save");
+    auto removal = std::make_shared<std::pair<std::string, std::string>>();
+    remove->add_option("PROJECT", *path, "the project file")->required();
+    remove->add_option("--target", removal->first, "the target's name")->required();
+    remove->add_option("ITEM", removal->second, "the item's path below the target (Folder/Name)")
+        ->required();
+    remove->callback([&request, path, removal] {
+        request.run = [&request, path, removal] {
+            return wbhost::cli::RunRemoveItem(request.host, *path, removal->first,
+                                              removal->second, std::cout, std::cerr);
+        };
+    });
 }
 
 void AddEdit(CLI::App& app, Request& request) {

@@ -1,26 +1,148 @@
-// The Tangent I/O item: a named use of one FPGA I/O resource of the item's target. It is
-// constructed empty (resource status 1, missing, and no attribute bag) and receives its bag by
-// creation or when a project is opened.
+// The Tangent I/O item: a named use of one FPGA I/O resource of the item's target. It keeps an
+// attribute bag whose "resource" names the resource, saves the bag in its host item's
+// properties, reserves and watches the resource node, and reports a resource status.
 #pragma once
 
-#include "framework/CqxProjectItemUI.h"
+#include "attribute_bag/TIOAttrBag.h"
+#include "framework/IqxPersistableItem3.h"
+#include "host/ResourceNode.h"
+#include "host/contracts/IwbProjectPropertyBag.h"
+#include "host/contracts/IwbhwResourceTreeNodeObserver.h"
+#include "items/BaseHWItemUI.h"
+#include "items/TIOItemInterfaces.h"
 
 #include <memory>
+#include <string>
 
-class TIOAttrBag;
+class ItemResourceContext;
 
-class TIOInstanceItemUI : public CqxProjectItemUI {
+// Resource statuses, also stored in "tioResourceStatus".
+namespace tio::status {
+inline constexpr int32_t kBound = 0;    // the node exists and is reserved for the item
+inline constexpr int32_t kMissing = 1;  // no tree, no resource chosen, or no node at the path
+inline constexpr int32_t kConflict = 2; // the node exists but another item holds it
+} // namespace tio::status
+
+class TIOInstanceItemUI : public TIOAttrBag::ChangeObserver,
+                          public IwbhwResourceItemUI2,
+                          public IwbTIOItemUIPrivate,
+                          public IwbhwResourceTreeNodeObserver,
+                          public IwbTIOGAttributeSet,
+                          public IwbTIOInstanceItemUI,
+                          public IwbTIOItemError,
+                          public IwbTIOItemScope,
+                          public wbhw::BaseHWItemUI,
+                          public IqxPersistableItem3 {
 public:
+    using Interfaces = wbhw::BaseHWItemUI::Interfaces::Append<
+        IwbhwResourceItemUI2, IwbTIOItemUIPrivate, IwbhwResourceTreeNodeObserver,
+        IwbTIOGAttributeSet, IwbTIOInstanceItemUI, IwbTIOItemError, IwbTIOItemScope,
+        IqxPersistableItem3>;
+
     // 0 bound, 1 missing, 2 held by another item.
     int32_t resourceStatus() const { return resourceStatus_; }
     // The item's attribute bag; null until the item is loaded.
     const TIOAttrBag* attributeBag() const { return attrBag_.get(); }
 
+    // IqxItemUI / IqxBindable / IqxProjectItemUI
+    HRESULT Bind(IwbProjectItem* item) override;
+    HRESULT GetIconName(BSTR* name) override;
+    HRESULT IsValid() override;
+
+    // TIOAttrBag::ChangeObserver: writes the bag into "tioAttrBag" when its text changed.
+    int32_t OnAttrBagChanged(TIOAttrBag& set, bool wasDirty, bool forced) override;
+
+    // IwbhwResourceTreeNodeObserver
+    HRESULT OnNodeEvent(IUnknown* node, uint32_t events, uint32_t kind) override;
+
+    // IwbCompileConfiguration
+    HRESULT GetCompileConfiguration(BSTR* text) override;
+
+    // IwbhwResourceItemUI2
+    HRESULT GetResource(BSTR* path, int32_t* exists, int32_t* reserved) override;
+    HRESULT GetResourcePath(BSTR* path) override;
+    HRESULT Rebind() override;
+    HRESULT SetResource(const char16_t* path) override;
+
+    // IwbTIOItemUIPrivate
+    HRESULT SetAttributes(uint32_t count, const char16_t* const* texts) override;
+    HRESULT GetDecoratedName(BSTR* name, int32_t* fromResource) override;
+
+    // IwbTIOGAttributeSet
+    HRESULT GetAttribute(const char16_t* path, BSTR* value) override;
+    HRESULT GetAttributeNames(const char16_t* options, uint32_t* count, BSTR** names) override;
+
+    // IwbTIOInstanceItemUI
+    HRESULT SetPhysical(int32_t physical) override;
+    HRESULT IsPhysical() override;
+    HRESULT ResourceOK() override;
+    HRESULT GetResourceStatus(int32_t* status) override;
+
+    // IwbTIOItemError
+    HRESULT HasError() override;
+    HRESULT GetErrorText(BSTR* text) override;
+
+    // IwbTIOItemScope
+    HRESULT GetScope(uint32_t* count, GUID** types, BSTR** names) override;
+
+    // IqxPersistableItem3: everything lives in the property bag, so there is nothing to do.
+    HRESULT IsDirty() override { return S_FALSE; }
+    HRESULT SaveState(IUnknown*) override { return E_NOTIMPL; }
+    HRESULT WantsState() override { return S_FALSE; }
+    HRESULT LoadState(IUnknown*) override { return E_NOTIMPL; }
+
 protected:
     TIOInstanceItemUI();
     ~TIOInstanceItemUI() override;
 
+    std::u16string InitialIconName() const override;
+    HRESULT NotifyOwner() override;
+    HRESULT Detach() override;
+
 private:
+    // Reads the bag from "tioAttrBag" (an empty one when absent) and binds to its resource.
+    HRESULT Load();
+    // Undoes the watches and reservation of the node at the last bound path, brings the working
+    // set in line with its resource's definitions and reserves and watches the resource again.
+    // CONTEXT null: found from the item. KIND and EVENTS: the notification that asked for it.
+    HRESULT BindToResource(ItemResourceContext* context, uint32_t kind, uint32_t events);
+    // Records STATUS, refreshes the item, applies the hidden rule (RESOURCE: the node at the
+    // working set's path, empty when there is none) and stores the status.
+    void SetStatus(int32_t status, const qv::host::ResourceNode& resource);
+    // Hides the item when its resource says "HiddenTIO" (remembered in the property) or the
+    // property says so already.
+    void ApplyHiddenRule(const qv::host::ResourceNode& resource);
+
+    // Notifications, by registration kind.
+    void OnResourceEvent(const qv::host::ResourceNode& node, uint32_t events);
+    HRESULT OnWatchEvent(const qv::host::ResourceNode& node, uint32_t events);
+    void OnSignatureEvent(const qv::host::ResourceNode& node, uint32_t events);
+
+    // Watches on the resource node's attribute definitions (kind 3).
+    void ObserveDefinitions(const qv::host::ResourceNode& resource, uint32_t events);
+    void StopDefinitions(const qv::host::ResourceNode& resource);
+    // Watches on its methods and properties (kind 4), recording their signatures.
+    void ObserveSignatures(const qv::host::ResourceNode& resource);
+    void StopSignatures(const qv::host::ResourceNode& resource);
+    void IncrementFeatureSetVersion();
+    // Watches for the resource at the working set's path to appear below WATCHED (kind 2).
+    void WatchForResource(const qv::host::ResourceNode& watched);
+
+    // Appends the compile configuration to OUT (what was built stays when a query throws).
+    void BuildCompileConfiguration(std::u16string& out);
+    // The root of the item's resource tree, or empty when the item has no tree (yet).
+    qv::host::ResourceNode TreeRoot();
+    // The node at the working set's "resource" path, or empty.
+    qv::host::ResourceNode ResourceNodeOf(const qv::host::ResourceNode& root) const;
+    // The working set's "resource" path ("" before the item is loaded).
+    std::u16string ResourcePathValue() const;
+    qv::com::ComPtr<IwbProjectPropertyBag> Properties() const;
+    IwbhwResourceTreeNodeObserver* AsObserver() { return this; }
+    IUnknown* Self();
+
     std::unique_ptr<TIOAttrBag> attrBag_;
-    int32_t resourceStatus_ = 1;
+    TIOAttrBag* workingSet_ = nullptr;
+    std::u16string resourcePath_;
+    int32_t resourceStatus_ = tio::status::kMissing;
+    bool iconResolved_ = false;
 };

@@ -5,6 +5,7 @@
 #include "com/ComObject.h"
 #include "com/ComPtr.h"
 #include "framework/CqxProviderList.h"
+#include "kern/osdep/CqvCS.h"
 #include "provider/TIOProvider.h"
 
 #include <mutex>
@@ -13,8 +14,10 @@ namespace tio {
 
 namespace {
 
-std::mutex& ProviderLock() {
-    static std::mutex lock;
+// Re-entrant: a provider released while the lock is held may come back into qxGetProvider on
+// the same thread.
+Bytefair::CqvCS& ProviderLock() {
+    static Bytefair::CqvCS lock;
     return lock;
 }
 

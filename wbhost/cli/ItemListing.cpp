@@ -5,6 +5,7 @@
 #include "cli/HostText.h"
 #include "cli/ItemStates.h"
 #include "kern/GuidText.h"
+#include "project/HexStatus.h"
 #include "provider/TIOIdentifiers.h"
 
 #include <ostream>
@@ -92,6 +93,8 @@ void PrintItemTree(const project::ProjectItem& item, std::ostream& out, int dept
         out << " hidden";
     if (!item.DescriptionFile().empty())
         out << " from " << item.DescriptionFile();
+    if (FAILED(item.BindStatus()))
+        out << " (its object did not bind: status " << HexStatus(item.BindStatus()) << ")";
     out << "\n";
     const auto& properties = item.Bag().Properties();
     const bool isIOItem = IsEqualGUID(item.Type(), tio::kIOItemType);

@@ -72,10 +72,11 @@ const ProjectItem* IOItemNamed(const ProjectItem& scope, std::u16string_view nam
     return nullptr;
 }
 
-// Makes the Tangent I/O item NAME below PARENT through the provider; null with the reason on ERR.
-// I/O item names are unique in their whole target (TARGET), folders or not.
-ProjectItem* NewIOItem(ProjectItem& target, ProjectItem& parent, const std::u16string& name,
-                       std::ostream& err) {
+// Makes the Tangent I/O item NAME below PARENT with the attribute set BAG stored before its
+// object loads, as a new item arrives with its bag; null with the reason on ERR. I/O item names
+// are unique in their whole target (TARGET), folders or not.
+ProjectItem* NewIOItem(project::Project& project, ProjectItem& target, ProjectItem& parent,
+                       const std::u16string& name, const std::u16string& bag, std::ostream& err) {
     if (ProjectItem* existing = ChildNamed(parent, name)) {
         err << "wbhost: \"" << ToUtf8(parent.Name()) << "\" already has an item called \""
             << ToUtf8(existing->Name()) << "\"\n";
@@ -86,29 +87,36 @@ ProjectItem* NewIOItem(ProjectItem& target, ProjectItem& parent, const std::u16s
             << "\" already has an I/O item called \"" << ToUtf8(existing->Name()) << "\"\n";
         return nullptr;
     }
-    if (const HRESULT made = parent.CreateChild(tio::kIOItemType, name.c_str(), nullptr);
+    project::Property text;
+    text.text = bag;
+    qv::com::ComPtr<ProjectItem> item;
+    if (const HRESULT made = project.CreateItem(parent, tio::kIOItemType, name,
+                                                {{u"tioAttrBag", text}}, &item);
         FAILED(made)) {
         err << "wbhost: the module's provider cannot make a Tangent I/O item now (status "
             << HexStatus(made) << ")\n";
         return nullptr;
     }
-    ProjectItem* item = ChildNamed(parent, name);
-    if (item != nullptr && item->Object() == nullptr) {
+    if (item->Object() == nullptr) {
         // A module that does not know the type leaves a bare item behind: not worth keeping.
-        parent.RemoveChild(item);
+        parent.RemoveChild(item.Get());
         err << "wbhost: the loaded module's provider does not make Tangent I/O items\n";
         return nullptr;
     }
-    return item;
+    return item.Get();
 }
 
-bool ResourceExists(project::Project& project, ProjectItem& target, std::u16string_view path) {
+// The path of the resource node PATH names in TARGET's tree, as the tree writes it; empty when
+// there is no such node.
+std::u16string ResourceNodePath(project::Project& project, ProjectItem& target,
+                                std::u16string_view path) {
     project::TargetObject* object = project.TargetOf(target);
     if (object == nullptr)
-        return false;
+        return {};
     resources::ResourceTree& tree = *object->Target().tree;
     const std::lock_guard hold(tree.Mutex());
-    return tree.Find(path) != nullptr;
+    const wbhw::ResTreeNode* node = tree.Find(path);
+    return node != nullptr ? node->Path() : std::u16string();
 }
 
 bool SaveProject(session::HostSession& session, const std::string& path, std::ostream& err) {
@@ -197,8 +205,10 @@ int RunAddItem(const HostOptions& options, const std::string& projectPath,
     ProjectItem* target = FindTarget(project, request.target, err);
     if (target == nullptr)
         return kProjectFailed;
-    const std::u16string resource = FromUtf8(request.resource);
-    if (resource.empty() || !ResourceExists(project, *target, resource)) {
+    const std::u16string asked = FromUtf8(request.resource);
+    const std::u16string resource =
+        asked.empty() ? std::u16string() : ResourceNodePath(project, *target, asked);
+    if (resource.empty() || resource == u"/") {
         err << "wbhost: target \"" << request.target << "\" has no resource \"" << request.resource
             << "\"\n";
         return kProjectFailed;
@@ -206,6 +216,7 @@ int RunAddItem(const HostOptions& options, const std::string& projectPath,
     const std::u16string place = request.name.empty()
                                      ? resource.substr(resource.find_last_of(u'/') + 1)
                                      : FromUtf8(request.name);
+    // Resource paths are kept as the tree writes them, whatever spelling found the node.
     const std::vector<std::u16string> parts = SplitPlace(place);
     if (parts.empty()) {
         err << "wbhost: \"" << ToUtf8(place) << "\" is no item name (empty name or folder)\n";
@@ -214,16 +225,47 @@ int RunAddItem(const HostOptions& options, const std::string& projectPath,
     ProjectItem* parent = target;
     for (size_t i = 0; i + 1 < parts.size() && parent != nullptr; ++i)
         parent = FolderIn(*parent, parts[i], err);
-    ProjectItem* item =
-        parent == nullptr ? nullptr : NewIOItem(*target, *parent, parts.back(), err);
+    ProjectItem* item = parent == nullptr
+                            ? nullptr
+                            : NewIOItem(project, *target, *parent, parts.back(),
+                                        NewItemAttributeSet(place, resource), err);
     if (item == nullptr)
         return kProjectFailed;
-    // The attribute set the item keeps and binds from, as the new-item wizard would hand it.
-    item->Bag().SetString(u"tioAttrBag", NewItemAttributeSet(place, resource).c_str(), 0);
     if (!SaveProject(session, projectPath, err))
         return kProjectFailed;
     out << "added \"" << ToUtf8(place) << "\" for " << request.resource << " to target \""
         << ToUtf8(target->Name()) << "\"\n";
+    PrintItemTree(*target, out);
+    FinishSession(options, session, out);
+    return kProjectOk;
+}
+
+int RunRemoveItem(const HostOptions& options, const std::string& projectPath,
+                  const std::string& targetName, const std::string& itemPath, std::ostream& out,
+                  std::ostream& err) {
+    session::HostSession session;
+    if (!StartProjectSession(options, session, projectPath, err))
+        return kProjectFailed;
+    project::Project& project = *session.Project();
+    ProjectItem* target = FindTarget(project, targetName, err);
+    if (target == nullptr)
+        return kProjectFailed;
+    ProjectItem* item = target;
+    for (const std::u16string& part : SplitPlace(FromUtf8(itemPath))) {
+        item = ChildNamed(*item, part);
+        if (item == nullptr)
+            break;
+    }
+    if (item == nullptr || item == target) {
+        err << "wbhost: target \"" << targetName << "\" has no item \"" << itemPath << "\"\n";
+        return kProjectFailed;
+    }
+    if (const HRESULT hr = project.RemoveItem(*item); FAILED(hr))
+        err << "warning: the item's object answered its removal with status " << HexStatus(hr)
+            << "\n";
+    if (!SaveProject(session, projectPath, err))
+        return kProjectFailed;
+    out << "removed \"" << itemPath << "\" from target \"" << targetName << "\"\n";
     PrintItemTree(*target, out);
     FinishSession(options, session, out);
     return kProjectOk;

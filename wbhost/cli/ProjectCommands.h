@@ -45,4 +45,12 @@ struct AddItemRequest {
 int RunAddItem(const HostOptions& options, const std::string& projectPath,
                const AddItemRequest& request, std::ostream& out, std::ostream& err);
 
+// Removes the item ITEMPATH ("Folder/Name", folders too, with what is below them) from the
+// target TARGET of the project PROJECTPATH as the project tree does: each item's object hears
+// its removal (it lets go of its resource) before the item goes; then saves and writes the
+// target's items to OUT. Fails, leaving the file as it was, when the target or item is unknown.
+int RunRemoveItem(const HostOptions& options, const std::string& projectPath,
+                  const std::string& target, const std::string& itemPath, std::ostream& out,
+                  std::ostream& err);
+
 } // namespace wbhost::cli

@@ -3,7 +3,10 @@
 
 #include "kern/Guid.h"
 #include "kern/Utf8.h"
+#include "framework/IqxBindable.h"
+#include "framework/IqxItemUI.h"
 #include "project/AtomicFile.h"
+#include "project/FolderObject.h"
 #include "project/HexStatus.h"
 #include "project/ItemUIMap.h"
 
@@ -19,6 +22,31 @@ void SetError(std::string* error, std::string message) {
     if (error != nullptr)
         *error = std::move(message);
 }
+
+// Gives ITEM the host's own object (the project root and folders have no provider).
+void GiveFolderObject(ProjectItem& item) {
+    FolderObjectInstance* made = nullptr;
+    if (FAILED(FolderObjectInstance::CreateInstance(&made, &item)))
+        throw std::bad_alloc();
+    item.SetObject(ComPtr<IUnknown>::Adopt(made->GetUnknown()));
+}
+
+// Tells the object of ITEM, and first those below it, that they are being removed; answers the
+// first failure.
+HRESULT AnnounceRemoval(ProjectItem& item) {
+    HRESULT first = S_OK;
+    for (const auto& child : item.Children()) {
+        const HRESULT hr = AnnounceRemoval(*child.Get());
+        if (SUCCEEDED(first) && FAILED(hr))
+            first = hr;
+    }
+    if (const auto object = qv::com::QueryAs<IqxItemUI>(item.Object())) {
+        const HRESULT hr = object->Remove();
+        if (SUCCEEDED(first) && FAILED(hr))
+            first = hr;
+    }
+    return first;
+}
 } // namespace
 
 Project::Project(resources::ResourceService& service, std::u16string name) : service_(service) {
@@ -31,13 +59,19 @@ Project::Project(resources::ResourceService& service, std::u16string name) : ser
     uiMap_ = ComPtr<IwbProjectItemUIMap>::Adopt(map);
     if (!root_ || !uiMap_)
         throw std::bad_alloc();
+    GiveFolderObject(*root_.Get());
 }
 
 Project::~Project() {
     DetachProviders();
-    for (const auto& target : targets_)
-        if (TargetObject* object = TargetOf(*target.Get()))
+    for (const auto& target : targets_) {
+        if (TargetObject* object = TargetOf(*target.Get())) {
             object->Clear();
+            // The items' watches and reservations hold the items; the trees were this
+            // project's alone.
+            object->Target().tree->Shutdown();
+        }
+    }
     root_->Close();
 }
 
@@ -83,19 +117,60 @@ HRESULT Project::AttachTarget(ProjectItem& item, const std::string& description,
 }
 
 HRESULT Project::MakeObject(ProjectItem& item, bool reloaded) {
-    if (IsEqualGUID(item.Type(), wbproj::kFolderType))
+    if (IsEqualGUID(item.Type(), wbproj::kFolderType)) {
+        GiveFolderObject(item);
         return S_OK;
+    }
     if (IsEqualGUID(item.Type(), kTargetType) || IsEqualGUID(item.Type(), kProjectType))
         return E_INVALIDARG;
     if (!factory_)
         return S_OK;
     ComPtr<IUnknown> object;
     IUnknown* const state = reloaded ? static_cast<IUnknown*>(&item.Bag()) : nullptr;
-    const HRESULT hr = factory_(item, item.Type(), state, object);
-    if (FAILED(hr))
+    HRESULT hr = factory_(item, item.Type(), state, object);
+    if (SUCCEEDED(hr) && object) {
+        // As the framework does: the item knows its object before the object is initialised
+        // (once) and bound, since binding walks up from the item through the item objects. An
+        // object that does not bind stays, so the item keeps its behaviour and its status.
+        item.SetObject(object);
+        if (const auto itemUI = object.As<IqxItemUI>())
+            hr = itemUI->Initialize();
+        if (const auto bindable = object.As<IqxBindable>(); SUCCEEDED(hr) && bindable)
+            hr = bindable->Bind(&item);
+    }
+    item.SetBindStatus(FAILED(hr) ? hr : S_OK);
+    return FAILED(hr) ? hr : S_OK;
+}
+
+HRESULT Project::CreateItem(ProjectItem& parent, const GUID& type, std::u16string name,
+                            const PropertyBag::Map& properties, ComPtr<ProjectItem>* made) {
+    ComPtr<ProjectItem> item = parent.AddChild(type, qv::kern::MakeGUID(), std::move(name));
+    if (!item)
+        return E_OUTOFMEMORY;
+    for (const auto& [key, property] : properties)
+        item->Bag().Put(key, property);
+    if (const HRESULT hr = MakeObject(*item.Get(), !properties.empty()); FAILED(hr)) {
+        // A child whose object refused it would be saved with no behaviour: drop it.
+        AnnounceRemoval(*item.Get());
+        parent.RemoveChild(item.Get());
         return hr;
-    item.SetObject(std::move(object));
+    }
+    if (made != nullptr)
+        *made = std::move(item);
     return S_OK;
+}
+
+HRESULT Project::RemoveItem(ProjectItem& item) {
+    ProjectItem* const parent = item.Parent();
+    if (parent == nullptr || IsEqualGUID(item.Type(), kTargetType))
+        return E_INVALIDARG;
+    if (FindById(item.Id()) != &item)
+        return S_FALSE;
+    // Held: the parent's list holds the last reference the host has.
+    const ComPtr<ProjectItem> held = ComPtr<ProjectItem>::Share(&item);
+    const HRESULT announced = AnnounceRemoval(item);
+    parent->RemoveChild(&item);
+    return FAILED(announced) ? announced : S_OK;
 }
 
 ProjectItem* Project::FindById(const GUID& id) {
@@ -198,6 +273,7 @@ bool Project::Build(const SavedProject& saved, std::string* error) {
         throw std::bad_alloc();
     root_->Close();
     root_ = ComPtr<ProjectItem>::Adopt(root);
+    GiveFolderObject(*root_.Get());
     std::vector<ProjectItem*> made{root_.Get()};
     for (size_t i = 0; i < saved.items.size(); ++i) {
         const SavedItem& entry = saved.items[i];
@@ -215,15 +291,14 @@ bool Project::Build(const SavedProject& saved, std::string* error) {
             item->Bag().Put(name, property);
         if (i == 0)
             continue;
-        const HRESULT hr = IsEqualGUID(entry.type, kTargetType)
-                               ? AttachTarget(*item.Get(), entry.descriptionFile, error)
-                               : MakeObject(*item.Get(), true);
-        if (FAILED(hr)) {
-            if (error != nullptr && error->empty())
-                *error = "the item \"" + qv::kern::WideToUtf8(entry.name) +
-                         "\" was refused (status " + std::to_string(hr) + ")";
-            return false;
+        if (!IsEqualGUID(entry.type, kTargetType)) {
+            // An item that does not bind stays as it was read: its status says why, and saving
+            // writes back what it had.
+            MakeObject(*item.Get(), true);
+            continue;
         }
+        if (FAILED(AttachTarget(*item.Get(), entry.descriptionFile, error)))
+            return false;
     }
     return true;
 }

@@ -24,8 +24,9 @@ inline constexpr GUID kTargetType = qv::com::ParseGuid("9C188982-C57D-47B0-A23B-
 class Project {
 public:
     // Makes the object of ITEM, whose type is neither a folder nor a target, into OBJECT
-    // (left empty: the item has none). SAVEDSTATE is the item's reloaded property bag when the
-    // project is being opened, null for a new item. A failure refuses the item.
+    // (left empty: the item has none); the project then initialises and binds it. SAVEDSTATE is
+    // the item's reloaded property bag when the project is being opened, null for a new item. A
+    // failure refuses the item.
     using ObjectFactory =
         std::function<HRESULT(IwbProjectItem& item, const GUID& type, IUnknown* savedState,
                               qv::com::ComPtr<IUnknown>& object)>;
@@ -51,10 +52,23 @@ public:
 
     // Who makes the objects of items of other types (a provider, or a test); none by default.
     void SetObjectFactory(ObjectFactory factory) { factory_ = std::move(factory); }
-    // Makes ITEM's object for its type: folders get none, targets cannot be made this way
-    // (E_INVALIDARG: a target needs its description), others go to the factory, with the
-    // item's bag as saved state when RELOADED.
+    // Makes ITEM's object for its type: folders get the host's folder object, targets cannot be
+    // made this way (E_INVALIDARG: a target needs its description), others go to the factory,
+    // with the item's bag as saved state when RELOADED. An object that was made but did not bind
+    // is kept (with the status recorded on ITEM) and the status answered.
     HRESULT MakeObject(ProjectItem& item, bool reloaded = false);
+    // Adds an item of TYPE called NAME below PARENT whose properties start as PROPERTIES (what
+    // its object reads when it binds), then makes its object. When the object fails, the item
+    // is removed again (its object told first) and the failure answered. MADE (optional)
+    // receives the item.
+    HRESULT CreateItem(ProjectItem& parent, const GUID& type, std::u16string name,
+                       const PropertyBag::Map& properties,
+                       qv::com::ComPtr<ProjectItem>* made = nullptr);
+    // Removes ITEM and everything below it from the project: every object hears its removal
+    // (IqxItemUI::Remove), children before their parent, before the items go. E_INVALIDARG for
+    // the root or a target (targets stay with their description), S_FALSE for an item of
+    // another project. An object's failure is answered after the items are gone.
+    HRESULT RemoveItem(ProjectItem& item);
     // The map from information records to objects.
     const qv::com::ComPtr<IwbProjectItemUIMap>& UIMap() const noexcept { return uiMap_; }
     // The item with identifier ID, or null.
@@ -77,8 +91,9 @@ public:
               const std::function<bool()>& beforeRename = {}) const;
     // Reads the project file PATH into a new project whose targets load through SERVICE and
     // whose other objects FACTORY makes. Null with a message in ERROR (may be null) when the
-    // file cannot be read, is malformed, a target's description does not load or the factory
-    // refuses an item; nothing else is touched then.
+    // file cannot be read, is malformed or a target's description does not load; nothing else
+    // is touched then. An item whose object does not bind stays, with its status recorded and
+    // its properties as they were read, so saving the project loses nothing of it.
     static std::unique_ptr<Project> Open(const std::string& path,
                                          resources::ResourceService& service, std::string* error,
                                          ObjectFactory factory = {});

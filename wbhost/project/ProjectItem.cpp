@@ -7,6 +7,7 @@
 #include "host/contracts/IwbProjectItemUIMap.h"
 #include "kern/Collate.h"
 #include "kern/Guid.h"
+#include "project/FolderObject.h"
 #include "project/Project.h"
 
 #include <algorithm>
@@ -85,18 +86,11 @@ HRESULT ProjectItem::CreateChild(const GUID& type, const char16_t* name, IwbProj
     if (project_ == nullptr)
         return E_UNEXPECTED; // the item was closed with its project
     return qv::com::GuardCall([&]() -> HRESULT {
-        ComPtr<ProjectItem> made = AddChild(type, qv::kern::MakeGUID(), name);
-        if (!made)
-            return E_OUTOFMEMORY;
-        const HRESULT hr = project_->MakeObject(*made.Get());
-        if (FAILED(hr)) {
-            // A child whose provider refused it would be saved with no behaviour: drop it.
-            RemoveChild(made.Get());
-            return hr;
-        }
-        if (child != nullptr)
+        ComPtr<ProjectItem> made;
+        const HRESULT hr = project_->CreateItem(*this, type, name, {}, &made);
+        if (SUCCEEDED(hr) && child != nullptr)
             *child = made.Detach();
-        return S_OK;
+        return hr;
     });
 }
 
@@ -221,8 +215,11 @@ bool ProjectItem::RemoveChild(ProjectItem* child) {
 void ProjectItem::Close() {
     project_ = nullptr;
     parent_ = nullptr;
-    // Objects often hold their own item; dropping them first breaks that cycle.
+    // Objects often hold their own item; dropping them first breaks that cycle. The host's own
+    // objects do not hold it, so they are told it is gone.
     ComPtr<IUnknown> object = std::move(object_);
+    if (const auto own = qv::com::QueryAs<IwbHostItemObject>(object.Get()))
+        static_cast<FolderObject*>(own.Get())->Forget();
     object.Reset();
     std::vector<ComPtr<ProjectItem>> children = std::move(children_);
     children_.clear();

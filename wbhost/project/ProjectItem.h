@@ -64,6 +64,11 @@ public:
     // references still held elsewhere reach a detached item instead of freed memory.
     void Close();
 
+    // The status of the last attempt to make and bind the item's object (S_OK when it bound or
+    // the item needs none).
+    HRESULT BindStatus() const noexcept { return bindStatus_; }
+    void SetBindStatus(HRESULT status) noexcept { bindStatus_ = status; }
+
     // What the project tree was asked to do, for tests.
     const std::vector<uint32_t>& Refreshes() const noexcept { return refreshes_; }
     int SelectCount() const noexcept { return selects_; }
@@ -80,6 +85,7 @@ private:
     qv::com::ComPtr<IUnknown> object_;
     std::vector<qv::com::ComPtr<ProjectItem>> children_;
     std::string descriptionFile_;
+    HRESULT bindStatus_ = S_OK;
     std::vector<uint32_t> refreshes_;
     int selects_ = 0;
     int32_t lastShow_ = 0;

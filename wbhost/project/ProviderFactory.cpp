@@ -2,7 +2,6 @@
 #include "project/ProviderFactory.h"
 
 #include "com/TaskMem.h"
-#include "framework/IqxBindable.h"
 
 #include <algorithm>
 #include <vector>
@@ -24,7 +23,7 @@ std::vector<GUID> ItemTypes(IqxProvider& provider) {
 } // namespace
 
 Project::ObjectFactory ProviderFactory(qv::com::ComPtr<IqxProvider> provider) {
-    return [provider](IwbProjectItem& item, const GUID& type, IUnknown* savedState,
+    return [provider](IwbProjectItem&, const GUID& type, IUnknown* savedState,
                       qv::com::ComPtr<IUnknown>& object) -> HRESULT {
         if (!provider)
             return S_OK;
@@ -42,10 +41,6 @@ Project::ObjectFactory ProviderFactory(qv::com::ComPtr<IqxProvider> provider) {
             return hr;
         if (!held)
             return E_UNEXPECTED;
-        if (const auto bindable = held.As<IqxBindable>()) {
-            if (const HRESULT bound = bindable->Bind(&item); FAILED(bound))
-                return bound;
-        }
         object = std::move(held);
         return S_OK;
     };

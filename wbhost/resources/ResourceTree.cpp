@@ -189,16 +189,15 @@ void ResourceTree::PlanDescendants(wbhw::ResTreeNode& node, uint32_t events, Pla
 }
 
 void ResourceTree::PlanRemoval(wbhw::ResTreeNode& node, Plan& plan) {
-    const auto found = states_.find(&node);
-    const bool observed = found != states_.end() && !found->second->observers.empty();
-    if (observed)
-        plan.emplace_back(found->second, wbhw::node_event::kAboutToBeRemoved);
+    // Every node of the part is planned, watched or not: an observer that hears a node go may
+    // start watching its parent, which goes too, and must then hear that as well.
+    const std::shared_ptr<NodeState> state = Track(node);
+    plan.emplace_back(state, wbhw::node_event::kAboutToBeRemoved);
     for (auto entry = node.Begin(); entry != node.End(); ++entry) {
         if (entry->Child() != nullptr)
             PlanRemoval(*entry->Child(), plan);
     }
-    if (observed)
-        plan.emplace_back(found->second, wbhw::node_event::kDetached);
+    plan.emplace_back(state, wbhw::node_event::kDetached);
 }
 
 void ResourceTree::Shutdown() {

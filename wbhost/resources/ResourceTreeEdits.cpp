@@ -3,6 +3,8 @@
 #include "resource_tree/ResTreeWriter.h"
 #include "resources/ResourceTree.h"
 
+#include <unordered_map>
+
 namespace wbhost::resources {
 namespace {
 
@@ -117,9 +119,14 @@ HRESULT ResourceTree::Rename(ResTreeNode& node, std::u16string_view newName) {
         ResTreeNode* renamed = CopyChild(*parked, *parent, next, wbhw::WString(newName), toParent);
         if (renamed == nullptr)
             return E_FAIL; // cannot happen: the name was checked and the old entry is gone
+        // Paired through the parked copy by identity: the two copies need not be walked in the
+        // same order (a node that keeps its entries sorted lists them otherwise).
+        std::unordered_map<const ResTreeNode*, ResTreeNode*> finalOf;
+        for (const auto& [parkedNode, final] : toParent)
+            finalOf.emplace(parkedNode, final);
         NodePairs moved;
-        for (size_t i = 0; i < toAside.size(); ++i)
-            moved.emplace_back(toAside[i].first, toParent[i].second);
+        for (const auto& [original, parkedNode] : toAside)
+            moved.emplace_back(original, finalOf.at(parkedNode));
         Rekey(moved);
         Plan plan{{Track(*renamed), event::kDisplayName},
                   {Track(*parent), event::kChildDisplayName}};
@@ -134,12 +141,17 @@ HRESULT ResourceTree::Rename(ResTreeNode& node, std::u16string_view newName) {
 }
 
 void ResourceTree::Rekey(const NodePairs& moved) {
+    // Taken out first, put back after: the copies may live at addresses the old nodes had (their
+    // memory is reused), so moving one state at a time could land on a key not moved yet.
+    std::vector<std::pair<std::shared_ptr<NodeState>, ResTreeNode*>> taken;
     for (const auto& [from, to] : moved) {
         const auto found = states_.find(from);
         if (found == states_.end())
             continue;
-        std::shared_ptr<NodeState> state = std::move(found->second);
+        taken.emplace_back(std::move(found->second), to);
         states_.erase(found);
+    }
+    for (auto& [state, to] : taken) {
         state->node = to;
         states_[to] = std::move(state);
     }
