@@ -224,7 +224,8 @@ TEST_F(ProjectFormatTest, AFailedOpenLeavesTheOpenProjectAlone) {
     EXPECT_FALSE(Project::Open(scratch.File("missing.wbproj"), service, &error));
     EXPECT_NE(error.find("missing.wbproj"), std::string::npos);
 
-    // A target whose description went away, and a provider that refuses an item.
+    // A target whose description went away refuses the project; an item whose object is refused
+    // stays, with the refusal recorded.
     auto target = project.AddTarget(u"T", scratch.Write("t.xml", kDescription), &error);
     project.Root().CreateChild(kItemType, u"Item", nullptr);
     ASSERT_TRUE(project.Save(path, &error));
@@ -232,10 +233,13 @@ TEST_F(ProjectFormatTest, AFailedOpenLeavesTheOpenProjectAlone) {
     EXPECT_FALSE(Project::Open(path, service, &error));
     EXPECT_NE(error.find("t.xml"), std::string::npos) << error;
     scratch.Write("t.xml", kDescription);
-    EXPECT_FALSE(Project::Open(
+    const auto reopened = Project::Open(
         path, service, &error,
-        [](IwbProjectItem&, const GUID&, IUnknown*, ComPtr<IUnknown>&) { return E_ACCESSDENIED; }));
-    EXPECT_NE(error.find("Item"), std::string::npos) << error;
+        [](IwbProjectItem&, const GUID&, IUnknown*, ComPtr<IUnknown>&) { return E_ACCESSDENIED; });
+    ASSERT_TRUE(reopened) << error;
+    const auto& kept = reopened->Root().Children();
+    ASSERT_EQ(kept.size(), 2u);
+    EXPECT_EQ(kept[1]->BindStatus(), E_ACCESSDENIED);
 
     int32_t value = 0;
     EXPECT_EQ(bag->GetInt(u"kept", &value), S_OK);

@@ -1,5 +1,6 @@
 // The host's project items: tree operations, property bags, enumeration and targets.
 #include "ProjectTestSupport.h"
+#include "project/FolderObject.h"
 #include "host/contracts/IwbProjectItemUIMap.h"
 #include "host/contracts/IwbhwResourceTreeNode.h"
 #include "project/Project.h"
@@ -91,7 +92,14 @@ TEST_F(ProjectItemTest, InfoRecordAndObjectMap) {
     object->Release();
     auto folder = Child(root, u"Folder");
     folder->GetInfoRecord(&record);
-    EXPECT_EQ(map->GetItemUI(&record, &object), S_FALSE); // folders have no object
+    // Folders have the host's own object, which hands back its item.
+    ASSERT_EQ(map->GetItemUI(&record, &object), S_OK);
+    const auto own = qv::com::QueryAs<wbhost::project::IwbHostItemObject>(object);
+    object->Release();
+    ASSERT_TRUE(own);
+    ComPtr<IwbProjectItem> back;
+    EXPECT_EQ(own->GetProjectItem(back.Put()), S_OK);
+    EXPECT_EQ(back.Get(), folder.Get());
     record.size = 71;
     EXPECT_EQ(map->GetItemUI(&record, &object), E_INVALIDARG);
     map->Release();

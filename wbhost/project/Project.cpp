@@ -12,6 +12,7 @@
 
 #include <algorithm>
 #include <functional>
+#include <unordered_map>
 
 namespace wbhost::project {
 
@@ -186,23 +187,33 @@ ProjectItem* Project::FindById(const GUID& id) {
 }
 
 SavedProject Project::Snapshot() const {
-    SavedProject saved;
-    std::function<void(const ProjectItem&, size_t)> add = [&](const ProjectItem& item,
-                                                              size_t parent) {
-        SavedItem entry;
-        entry.id = item.Id();
-        entry.type = item.Type();
-        entry.flags = item.Flags();
-        entry.name = item.Name();
-        entry.parent = parent;
-        entry.descriptionFile = item.DescriptionFile();
-        entry.properties = item.Bag().Properties();
-        const size_t index = saved.items.size();
-        saved.items.push_back(std::move(entry));
+    // Items are written in the order they came into the project (a parent always before its
+    // children), and reopening makes and binds them in that order: whichever item reserved a
+    // resource first reserves it first again, so every item comes back with its status.
+    std::vector<const ProjectItem*> items;
+    std::function<void(const ProjectItem&)> collect = [&](const ProjectItem& item) {
+        items.push_back(&item);
         for (const auto& child : item.Children())
-            add(*child.Get(), index);
+            collect(*child.Get());
     };
-    add(*root_.Get(), SavedItem::kNoParent);
+    collect(*root_.Get());
+    std::stable_sort(items.begin(), items.end(), [](const ProjectItem* a, const ProjectItem* b) {
+        return a->Sequence() < b->Sequence();
+    });
+    std::unordered_map<const ProjectItem*, size_t> indexOf;
+    SavedProject saved;
+    for (const ProjectItem* item : items) {
+        SavedItem entry;
+        entry.id = item->Id();
+        entry.type = item->Type();
+        entry.flags = item->Flags();
+        entry.name = item->Name();
+        entry.parent = item->Parent() != nullptr ? indexOf.at(item->Parent()) : SavedItem::kNoParent;
+        entry.descriptionFile = item->DescriptionFile();
+        entry.properties = item->Bag().Properties();
+        indexOf.emplace(item, saved.items.size());
+        saved.items.push_back(std::move(entry));
+    }
     return saved;
 }
 

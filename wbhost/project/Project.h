@@ -81,8 +81,11 @@ public:
     // Detaches every attached provider, the last attached first. Nothing when none is.
     void DetachProviders();
 
-    // Everything the project file keeps, parents before children.
+    // Everything the project file keeps, in the order the items came into the project (parents
+    // before children).
     SavedProject Snapshot() const;
+    // The next number of the order in which items come into the project.
+    uint64_t NextSequence() noexcept { return nextSequence_++; }
     // Writes the project to PATH atomically (see WriteFileAtomically): every attached provider
     // hears ProjectSaving first (a failure stops the save before anything is written and says
     // which status) and, once the file is in place, ProjectSaved. False with a message in ERROR
@@ -108,6 +111,7 @@ private:
     std::vector<qv::com::ComPtr<ProjectItem>> targets_;
     std::vector<qv::com::ComPtr<IwbProjectProvider>> providers_;
     ObjectFactory factory_;
+    uint64_t nextSequence_ = 0;
 };
 
 } // namespace wbhost::project

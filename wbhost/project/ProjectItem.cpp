@@ -17,7 +17,8 @@ namespace wbhost::project {
 using qv::com::ComPtr;
 
 ProjectItem::ProjectItem(Project* project, const GUID& type, const GUID& id, std::u16string name)
-    : project_(project), type_(type), id_(id), name_(std::move(name)) {}
+    : project_(project), type_(type), id_(id), name_(std::move(name)),
+      sequence_(project != nullptr ? project->NextSequence() : 0) {}
 
 HRESULT ProjectItem::FinalConstruct() {
     CQVComObject<PropertyBag>* bag = nullptr;

@@ -64,6 +64,9 @@ public:
     // references still held elsewhere reach a detached item instead of freed memory.
     void Close();
 
+    // Where the item stands in the order items came into its project.
+    uint64_t Sequence() const noexcept { return sequence_; }
+
     // The status of the last attempt to make and bind the item's object (S_OK when it bound or
     // the item needs none).
     HRESULT BindStatus() const noexcept { return bindStatus_; }
@@ -85,6 +88,7 @@ private:
     qv::com::ComPtr<IUnknown> object_;
     std::vector<qv::com::ComPtr<ProjectItem>> children_;
     std::string descriptionFile_;
+    uint64_t sequence_;
     HRESULT bindStatus_ = S_OK;
     std::vector<uint32_t> refreshes_;
     int selects_ = 0;

@@ -70,6 +70,8 @@ HRESULT PropertyBag::GetBool(const char16_t* name, int32_t* value) {
 HRESULT PropertyBag::Store(const char16_t* name, Property property) {
     if (const HRESULT hr = CheckName(name); FAILED(hr))
         return hr;
+    if (FAILED(writeFailure_))
+        return writeFailure_;
     return qv::com::GuardCall([&]() -> HRESULT {
         properties_[name] = std::move(property);
         return S_OK;

@@ -41,12 +41,15 @@ public:
     const Map& Properties() const noexcept { return properties_; }
     // Host side: stores PROPERTY under NAME (as reopening a project does).
     void Put(std::u16string name, Property property);
+    // Test hook: every write answers STATUS (a failure) and stores nothing, until S_OK is given.
+    void FailWrites(HRESULT status) noexcept { writeFailure_ = status; }
 
 private:
     // The property NAME of KIND: S_OK with it in FOUND, 1 when absent, a failure otherwise.
     HRESULT Lookup(const char16_t* name, Property::Kind kind, const Property** found) const;
     HRESULT Store(const char16_t* name, Property property);
     Map properties_;
+    HRESULT writeFailure_ = S_OK;
 };
 
 } // namespace wbhost::project

@@ -19,6 +19,8 @@ HRESULT ResourceTree::Reserve(wbhw::ResTreeNode& node, IwbProjectItem* item, uin
         return E_POINTER;
     if (mode != kSharedMode)
         return E_NOTIMPL;
+    if (FAILED(reserveFailure_))
+        return reserveFailure_;
     const std::lock_guard guard(mutex_);
     const std::shared_ptr<NodeState> state = Track(node);
     auto& holders = state->holders;

@@ -91,6 +91,8 @@ public:
     // reservation, 1 when another item does; other modes answer E_NOTIMPL. A change of holder
     // raises 0x40 on the node.
     HRESULT Reserve(wbhw::ResTreeNode& node, IwbProjectItem* item, uint32_t mode);
+    // Test hook: Reserve answers STATUS (a failure) and records nothing, until S_OK is given.
+    void FailReservations(HRESULT status) noexcept { reserveFailure_ = status; }
     // 0 when ITEM holds the reservation, 1 when not.
     HRESULT QueryReservation(wbhw::ResTreeNode& node, IwbProjectItem* item);
     // Forgets ITEM's request; 1 when it had none. The next item in line then holds it.
@@ -134,6 +136,7 @@ private:
     std::unique_ptr<wbhw::ResTreeNode> root_;
     std::unordered_map<const wbhw::ResTreeNode*, std::shared_ptr<NodeState>> states_;
     uint64_t notifications_ = 0;
+    HRESULT reserveFailure_ = S_OK;
 };
 
 } // namespace wbhost::resources

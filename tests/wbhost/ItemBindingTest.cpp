@@ -1,0 +1,293 @@
+// The Tangent I/O item in the embedded host: the real module's items bound to a real target's
+// tree, following its renames, removals and signature changes, saved and reopened.
+#include "ProjectTestSupport.h"
+#include "framework/IqxItemUI.h"
+#include "framework/IwbCompileConfiguration.h"
+#include "items/TIOItemInterfaces.h"
+#include "provider/TIOIdentifiers.h"
+#include "session/HostSession.h"
+
+#include <gtest/gtest.h>
+
+using namespace projecttest;
+using qv::com::ComPtr;
+using wbhost::project::ProjectItem;
+using wbhost::project::Property;
+
+namespace {
+
+constexpr const char* kBoard = R"(<Target>
+  <TIOItemIconName>Board.png</TIOItemIconName>
+  <Connector name="C0">
+    <Line name="DIO0">
+      <MethodSet>
+        <Method name="Read"><Signature>bool read()</Signature><Kind>sync</Kind>
+          <ReturnValue><Type>Boolean</Type></ReturnValue></Method>
+        <Method name="Write"><Signature>void write(bool)</Signature>
+          <ParameterList><Value name="Value"><Type>Boolean</Type></Value></ParameterList></Method>
+        <Method name="Flush"><Kind>async</Kind></Method>
+      </MethodSet>
+      <PropertySet><Property name="Mode"><Signature>enum mode</Signature></Property></PropertySet>
+      <AttributeSet>
+        <Attribute name="Speed"><Value> fast </Value></Attribute>
+        <Attribute name="Note"><Value>x</Value><DoesNotAffectCompilation>Yes</DoesNotAffectCompilation></Attribute>
+        <Attribute name="Kept"><Value>k</Value><DoesNotAffectCompilation>false</DoesNotAffectCompilation></Attribute>
+      </AttributeSet>
+    </Line>
+    <Line name="DIO1"><HiddenTIO>TRUE</HiddenTIO><TIOItemIconName>Line.png</TIOItemIconName></Line>
+    <Line name="DIO2"/>
+  </Connector>
+</Target>
+)";
+
+// The attribute-set text of a new item using RESOURCE.
+std::u16string BagFor(std::u16string_view resource) {
+    return u"<AttributeSet name=\"\">\n<Attribute name=\"resource\">\n<Value>" +
+           std::u16string(resource) + u"</Value>\n</Attribute>\n</AttributeSet>\n";
+}
+
+class ItemBindingTest : public ::testing::Test {
+protected:
+    void SetUp() override {
+        std::string error;
+        ASSERT_TRUE(session.Open(WBT_MODULE_PATH, &error)) << error;
+        ASSERT_TRUE(session.NewProject(u"P", &error)) << error;
+        target = session.Project()->AddTarget(u"T", scratch.Write("t.xml", kBoard), &error);
+        ASSERT_TRUE(target) << error;
+    }
+
+    wbhost::project::Project& Project() { return *session.Project(); }
+    wbhost::resources::ResourceTree& Tree() {
+        return *Project().TargetOf(*target.Get())->Target().tree;
+    }
+    wbhw::ResTreeNode& Node(std::u16string_view path) {
+        wbhw::ResTreeNode* node = Tree().Find(path);
+        EXPECT_NE(node, nullptr) << "no node at the path";
+        return node != nullptr ? *node : Tree().Root();
+    }
+
+    // A new item NAME below PARENT (the target when null) whose stored bag uses RESOURCE, or no
+    // bag at all when RESOURCE is null.
+    ProjectItem* AddItem(std::u16string name, const char16_t* resource,
+                         ProjectItem* parent = nullptr) {
+        wbhost::project::PropertyBag::Map properties;
+        if (resource != nullptr)
+            properties[u"tioAttrBag"] = Property{Property::Kind::String, BagFor(resource), 0};
+        ComPtr<ProjectItem> made;
+        EXPECT_EQ(Project().CreateItem(parent ? *parent : *target.Get(), tio::kIOItemType,
+                                       std::move(name), properties, &made),
+                  S_OK);
+        return made.Get();
+    }
+
+    static int32_t Int(ProjectItem* item, const char16_t* name, int32_t absent = -1) {
+        int32_t value = absent;
+        return item->Bag().GetInt(name, &value) == S_OK ? value : absent;
+    }
+    static int32_t Status(ProjectItem* item) { return Int(item, u"tioResourceStatus"); }
+    static int32_t Version(ProjectItem* item) { return Int(item, u"tioFeatureSetVersion", 0); }
+    static std::u16string StoredBag(ProjectItem* item) {
+        BSTR text = nullptr;
+        item->Bag().GetString(u"tioAttrBag", &text);
+        const qv::com::UniqueBstr held(text);
+        return qv::com::BstrToString(text);
+    }
+    template <class I> static ComPtr<I> As(ProjectItem* item) {
+        return qv::com::QueryAs<I>(item->Object());
+    }
+    static std::u16string Resource(ProjectItem* item) {
+        BSTR path = nullptr;
+        As<IwbhwResourceItemUI>(item)->GetResourcePath(&path);
+        const qv::com::UniqueBstr held(path);
+        return qv::com::BstrToString(path);
+    }
+    static std::u16string Config(IUnknown* object) {
+        BSTR text = nullptr;
+        EXPECT_EQ(qv::com::QueryAs<IwbCompileConfiguration>(object)->GetCompileConfiguration(&text),
+                  S_OK);
+        const qv::com::UniqueBstr held(text);
+        return qv::com::BstrToString(text);
+    }
+    static std::u16string Icon(ProjectItem* item) {
+        BSTR name = nullptr;
+        As<IqxItemUI>(item)->GetIconName(&name);
+        const qv::com::UniqueBstr held(name);
+        return qv::com::BstrToString(name);
+    }
+    size_t OwnerHeard() { return Project().TargetOf(*target.Get())->Changed().size(); }
+
+    ScratchFolder scratch;
+    wbhost::session::HostSession session;
+    ComPtr<ProjectItem> target;
+};
+
+TEST_F(ItemBindingTest, AnItemFollowsItsResourceThroughRenamesRemovalAndReturn) {
+    ProjectItem* item = AddItem(u"Valve", u"/C0/DIO0");
+    EXPECT_EQ(Status(item), 0);
+    EXPECT_EQ(Resource(item), u"/C0/DIO0");
+    // The definitions arrived with their defaults; the stored bag says so.
+    EXPECT_NE(StoredBag(item).find(u"<Value>fast</Value>"), std::u16string::npos);
+
+    // Renaming the node and an ancestor both move "resource", and the bag is saved each time
+    // with the owner told.
+    const size_t heard = OwnerHeard();
+    ASSERT_EQ(Tree().Rename(Node(u"/C0/DIO0"), u"Valve0"), S_OK);
+    EXPECT_EQ(Resource(item), u"/C0/Valve0");
+    ASSERT_EQ(Tree().Rename(Node(u"/C0"), u"Front"), S_OK);
+    EXPECT_EQ(Resource(item), u"/Front/Valve0");
+    EXPECT_NE(StoredBag(item).find(u"/Front/Valve0"), std::u16string::npos);
+    EXPECT_EQ(OwnerHeard(), heard + 2);
+    EXPECT_EQ(Status(item), 0);
+
+    // The whole connector goes: missing, and watching for the resource to come back.
+    ASSERT_EQ(Tree().RemoveChild(Tree().Root(), u"Front"), S_OK);
+    EXPECT_EQ(Status(item), 1);
+    EXPECT_EQ(As<IqxItemUI>(item)->IsValid(), S_FALSE);
+    ASSERT_EQ(Tree().InsertSubTree(Tree().Root(),
+                                   u"<Connector name=\"Front\"><Line name=\"Valve0\"/></Connector>"),
+              S_OK);
+    EXPECT_EQ(Status(item), 0);
+    EXPECT_EQ(Tree().QueryReservation(Node(u"/Front/Valve0"), item), S_OK);
+}
+
+TEST_F(ItemBindingTest, ASecondItemOnOneResourceIsInConflictUntilTheFirstIsRemoved) {
+    ProjectItem* first = AddItem(u"A", u"/C0/DIO2");
+    ProjectItem* second = AddItem(u"B", u"/C0/DIO2");
+    EXPECT_EQ(Status(first), 0);
+    EXPECT_EQ(Status(second), 2);
+    EXPECT_EQ(As<IwbTIOItemError>(second)->HasError(), S_OK);
+
+    const ComPtr<IUnknown> removed = ComPtr<IUnknown>::Share(first->Object());
+    const size_t heard = OwnerHeard();
+    ASSERT_EQ(Project().RemoveItem(*first), S_OK);
+    EXPECT_EQ(Status(second), 0);
+    EXPECT_EQ(OwnerHeard(), heard + 1);
+    // An item on its way out compiles to nothing and watches nothing any more.
+    EXPECT_EQ(Config(removed.Get()), u"");
+    ASSERT_EQ(Tree().Rename(Node(u"/C0/DIO2"), u"DIO9"), S_OK);
+    EXPECT_EQ(Resource(second), u"/C0/DIO9");
+}
+
+TEST_F(ItemBindingTest, SignatureChangesCountOncePerRealChange) {
+    ProjectItem* item = AddItem(u"A", u"/C0/DIO0");
+    ASSERT_EQ(Version(item), 0);
+    auto& read = Node(u"/C0/DIO0/MethodSet/Read");
+    ASSERT_EQ(Tree().SetAttribute(read, u"Signature", u"int read()"), S_OK);
+    EXPECT_EQ(Version(item), 1);
+    // The same signature in other case, or a method without one, is no change.
+    ASSERT_EQ(Tree().SetAttribute(read, u"Signature", u"INT READ()"), S_OK);
+    ASSERT_EQ(Tree().SetAttribute(Node(u"/C0/DIO0/MethodSet/Flush"), u"Kind", u"sync"), S_OK);
+    EXPECT_EQ(Version(item), 1);
+    // A new method counts, and is watched from then on.
+    ASSERT_EQ(Tree().InsertSubTree(Node(u"/C0/DIO0/MethodSet"),
+                                   u"<Method name=\"Reset\"><Signature>void reset()</Signature>"
+                                   u"</Method>"),
+              S_OK);
+    EXPECT_EQ(Version(item), 2);
+    ASSERT_EQ(Tree().SetAttribute(Node(u"/C0/DIO0/MethodSet/Reset"), u"Signature", u"void r(int)"),
+              S_OK);
+    EXPECT_EQ(Version(item), 3);
+}
+
+TEST_F(ItemBindingTest, TheCompileConfigurationSpellsOutWhatCompiledCodeDependsOn) {
+    ProjectItem* item = AddItem(u"A", u"/C0/DIO0");
+    // Attributes in name order ("Note" does not affect compilation, "Kept" does), trimmed; the
+    // status; the signed members with their other attributes; the method types.
+    EXPECT_EQ(Config(item->Object()),
+              u"Kept=k;resource=/C0/DIO0;Speed=fast;0"
+              u";<Method name=\"Read\"><Kind>sync</Kind></Method>"
+              u";<Method name=\"Write\"></Method>"
+              u";<Property name=\"Mode\"></Property>"
+              u";ReadMethodType=Boolean;WriteMethodType=Boolean");
+    EXPECT_EQ(Icon(item), u"Board.png");
+
+    // A resource marked "HiddenTIO" in capitals hides its item, for good.
+    ProjectItem* hidden = AddItem(u"H", u"/C0/DIO1");
+    EXPECT_EQ(hidden->Flags() & wbproj::kShownFlag, 0u);
+    EXPECT_EQ(Icon(hidden), u"Line.png");
+    hidden->SetFlags(hidden->Flags() | wbproj::kShownFlag);
+    ASSERT_EQ(Tree().SetAttribute(Node(u"/C0/DIO1"), u"HiddenTIO", u"false"), S_OK);
+    ASSERT_EQ(As<IwbhwResourceItemUI2>(hidden)->Rebind(), S_OK);
+    EXPECT_EQ(hidden->Flags() & wbproj::kShownFlag, 0u);
+}
+
+TEST_F(ItemBindingTest, AnItemWithoutABagIsMissingAndAnUnchangedBagIsNotWrittenAgain) {
+    ProjectItem* bare = AddItem(u"Bare", nullptr);
+    EXPECT_EQ(Status(bare), 1);
+    EXPECT_EQ(Resource(bare), u"");
+    EXPECT_NE(StoredBag(bare).find(u"name=\"resource\""), std::u16string::npos);
+
+    ProjectItem* item = AddItem(u"A", u"/C0/DIO0");
+    const size_t heard = OwnerHeard();
+    const std::u16string stored = StoredBag(item);
+    const char16_t* same[] = {u"<Cluster><Name></Name><NumElts>2</NumElts>"
+                              u"<String><Name>name</Name><Val>Speed</Val></String>"
+                              u"<String><Name>value</Name><Val>FAST</Val></String></Cluster>"};
+    ASSERT_EQ(As<IwbTIOItemUIPrivate>(item)->SetAttributes(1, same), S_OK);
+    EXPECT_EQ(StoredBag(item), stored);
+    EXPECT_EQ(OwnerHeard(), heard);
+}
+
+TEST_F(ItemBindingTest, AReopenedProjectBindsEveryItemBackAndKeepsOneThatCannotBind) {
+    ProjectItem* folder = nullptr;
+    {
+        ComPtr<ProjectItem> made;
+        ASSERT_EQ(Project().CreateItem(*target.Get(), wbproj::kFolderType, u"Sub", {}, &made),
+                  S_OK);
+        folder = made.Get();
+    }
+    AddItem(u"A", u"/C0/DIO2");
+    AddItem(u"B", u"/C0/DIO2", folder);
+    ProjectItem* broken = AddItem(u"C", u"/C0/DIO0");
+    // A bag that no longer reads (as another tool might have left it).
+    broken->Bag().Put(u"tioAttrBag", Property{Property::Kind::String, u"<AttributeSet", 0});
+    std::string error;
+    const std::string file = scratch.File("p.wbproj");
+    ASSERT_TRUE(session.Save(file, &error)) << error;
+    const std::string saved = wbhost::project::FormatProject(Project().Snapshot());
+
+    ASSERT_TRUE(session.OpenProject(file, &error)) << error;
+    ProjectItem& reopened = *Project().Targets().front().Get();
+    auto child = [](ProjectItem& parent, std::u16string_view name) {
+        for (const auto& each : parent.Children())
+            if (each->Name() == name)
+                return each.Get();
+        return static_cast<ProjectItem*>(nullptr);
+    };
+    EXPECT_EQ(Status(child(reopened, u"A")), 0);
+    EXPECT_EQ(Status(child(*child(reopened, u"Sub"), u"B")), 2);
+    ProjectItem* kept = child(reopened, u"C");
+    ASSERT_NE(kept, nullptr);
+    EXPECT_TRUE(FAILED(kept->BindStatus()));
+    EXPECT_EQ(StoredBag(kept), u"<AttributeSet");
+    EXPECT_EQ(wbhost::project::FormatProject(Project().Snapshot()), saved);
+}
+
+TEST_F(ItemBindingTest, FailingHostCallsComeBackAsStatusesAndLoseNothing) {
+    // A reservation the host cannot make refuses the new item: nothing of it stays behind.
+    Tree().FailReservations(E_ACCESSDENIED);
+    ComPtr<ProjectItem> refused;
+    EXPECT_EQ(Project().CreateItem(*target.Get(), tio::kIOItemType, u"A",
+                                   {{u"tioAttrBag",
+                                     Property{Property::Kind::String, BagFor(u"/C0/DIO0"), 0}}},
+                                   &refused),
+              E_ACCESSDENIED);
+    EXPECT_TRUE(target->Children().empty());
+    EXPECT_TRUE(Tree().ReservingItems(Node(u"/C0/DIO0"), nullptr).empty());
+    Tree().FailReservations(S_OK);
+
+    // Properties that cannot be written: the rename is answered with the failure, the stored
+    // bag stays as it was, and the change in memory is written with the next one.
+    ProjectItem* item = AddItem(u"A", u"/C0/DIO0");
+    const std::u16string stored = StoredBag(item);
+    item->Bag().FailWrites(E_OUTOFMEMORY);
+    ASSERT_EQ(Tree().Rename(Node(u"/C0/DIO0"), u"DIO7"), S_OK);
+    EXPECT_EQ(StoredBag(item), stored);
+    EXPECT_EQ(As<IwbhwResourceItemUI2>(item)->SetResource(u"/C0/DIO7"), E_OUTOFMEMORY);
+    item->Bag().FailWrites(S_OK);
+    ASSERT_EQ(As<IwbhwResourceItemUI2>(item)->Rebind(), S_OK);
+    EXPECT_NE(StoredBag(item).find(u"/C0/DIO7"), std::u16string::npos);
+    EXPECT_EQ(Status(item), 0);
+}
+
+} // namespace
