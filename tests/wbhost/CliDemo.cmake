@@ -29,7 +29,8 @@ expect_all("${OUT}" "renamed /Connector0/DIO1 to \"PumpLine\"" "Tangent I/O item
 run_wbhost(usage edit ${project} K20 rename Connector0/DIO1)
 expect_all("${ERR}" "usage: edit PROJECT TARGET rename NODE NEWNAME")
 run_wbhost(0 project list ${project})
-expect_all("${OUT}" "from ${project}.K20.xml" "resource=Connector0/DIO1")
+# The item followed its resource to its new name.
+expect_all("${OUT}" "from ${project}.K20.xml" "resource=/Connector0/PumpLine" "bound")
 
 file(WRITE ${SCRATCH}/answers.txt "# the user picks DIO5\nselect-resource:0=0\nselect-resource:1=text:DIO5\n")
 run_wbhost(0 program TIOSelectResourceDialog.gx --answers ${SCRATCH}/answers.txt

@@ -192,10 +192,10 @@ void PlayProject(Transcript& script, const HostOptions& options, const std::stri
                     });
     };
     addItem({"K40", "Connector0/DIO3", "Valve"},
-            {0, {"Tangent I/O item \"Valve\"", "resource=Connector0/DIO3"}, {}});
+            {0, {"Tangent I/O item \"Valve\"", "resource=/Connector0/DIO3"}, {}});
     addItem({"K40", "AnalogInputs/AI2", "Sensors/Pressure"},
             {0,
-             {"folder \"Sensors\"", "Tangent I/O item \"Pressure\"", "resource=AnalogInputs/AI2"},
+             {"folder \"Sensors\"", "Tangent I/O item \"Pressure\"", "resource=/AnalogInputs/AI2"},
              {}});
     addItem({"K40", "Connector0/DIO9", ""}, {1, {"has no resource \"Connector0/DIO9\""}, {}});
     addItem({"K40", "Connector1/DIO0", "valve"}, {1, {"already has an item called"}, {}});
