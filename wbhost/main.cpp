@@ -170,8 +170,8 @@ void AddProject(CLI::App& app, Request& request) {
         ->required();
     remove->callback([&request, path, removal] {
         request.run = [&request, path, removal] {
-            return wbhost::cli::RunRemoveItem(request.host, *path, removal->first,
-                                              removal->second, std::cout, std::cerr);
+            return wbhost::cli::RunRemoveItem(request.host, *path, removal->first, removal->second,
+                                              std::cout, std::cerr);
         };
     });
 }

@@ -15,8 +15,8 @@ class BaseItemUI : public CqxProjectItemUI,
                    public IwbProjectDragDrop,
                    public IwbProjectCutCopyPaste3 {
 public:
-    using Interfaces = CqxProjectItemUI::Interfaces::Append<IwbProjectDragDrop,
-                                                            IwbProjectCutCopyPaste3>;
+    using Interfaces =
+        CqxProjectItemUI::Interfaces::Append<IwbProjectDragDrop, IwbProjectCutCopyPaste3>;
 
     // Refuses without a dragged object or one that is not the framework's drag data; otherwise
     // the base's compatibility check decides.

@@ -106,8 +106,8 @@ void TIOInstanceItemUI::BuildCompileConfiguration(std::u16string& out) {
         if (member.Attribute(tio::kSignature))
             AppendMember(member, out);
     AppendMethodType(resource, u"MethodSet/Read", u"/ReturnValue/Type", u"ReadMethodType", out);
-    AppendMethodType(resource, u"MethodSet/Write", u"/ParameterList/Value/Type",
-                     u"WriteMethodType", out);
+    AppendMethodType(resource, u"MethodSet/Write", u"/ParameterList/Value/Type", u"WriteMethodType",
+                     out);
 }
 
 HRESULT TIOInstanceItemUI::GetCompileConfiguration(BSTR* text) {

@@ -34,10 +34,11 @@ class TIOInstanceItemUI : public TIOAttrBag::ChangeObserver,
                           public wbhw::BaseHWItemUI,
                           public IqxPersistableItem3 {
 public:
-    using Interfaces = wbhw::BaseHWItemUI::Interfaces::Append<
-        IwbhwResourceItemUI2, IwbTIOItemUIPrivate, IwbhwResourceTreeNodeObserver,
-        IwbTIOGAttributeSet, IwbTIOInstanceItemUI, IwbTIOItemError, IwbTIOItemScope,
-        IqxPersistableItem3>;
+    using Interfaces =
+        wbhw::BaseHWItemUI::Interfaces::Append<IwbhwResourceItemUI2, IwbTIOItemUIPrivate,
+                                               IwbhwResourceTreeNodeObserver, IwbTIOGAttributeSet,
+                                               IwbTIOInstanceItemUI, IwbTIOItemError,
+                                               IwbTIOItemScope, IqxPersistableItem3>;
 
     // 0 bound, 1 missing, 2 held by another item.
     int32_t resourceStatus() const { return resourceStatus_; }

@@ -54,8 +54,10 @@ bool OptionIsTrue(std::u16string_view options, std::u16string_view key) {
         const size_t equals = pair.find(u'=');
         if (equals == std::u16string::npos)
             continue;
-        const std::u16string_view name = wbhw::TrimBlanks(std::u16string_view(pair).substr(0, equals));
-        const std::u16string_view value = wbhw::TrimBlanks(std::u16string_view(pair).substr(equals + 1));
+        const std::u16string_view name =
+            wbhw::TrimBlanks(std::u16string_view(pair).substr(0, equals));
+        const std::u16string_view value =
+            wbhw::TrimBlanks(std::u16string_view(pair).substr(equals + 1));
         if (qv::kern::EqualsNoCase(name, key))
             return qv::kern::EqualsNoCase(value, u"true");
     }
@@ -204,9 +206,8 @@ HRESULT TIOInstanceItemUI::GetAttributeNames(const char16_t* options, uint32_t* 
 }
 
 HRESULT TIOInstanceItemUI::SetPhysical(int32_t physical) {
-    return GuardCall([&] {
-        return Properties()->SetBool(tio::kPhysicalProperty, physical != 0 ? 1 : 0, 1);
-    });
+    return GuardCall(
+        [&] { return Properties()->SetBool(tio::kPhysicalProperty, physical != 0 ? 1 : 0, 1); });
 }
 
 HRESULT TIOInstanceItemUI::IsPhysical() {

@@ -36,9 +36,9 @@ TEST(CliProjectCommands, ItemsAddedThroughTheProviderComeBackWithTheirAttributeS
 
     ASSERT_EQ(List(p), kProjectOk) << p.err.str();
     const std::string listing = p.out.str();
-    for (const char* piece : {"project \"p\"", "Tangent I/O item \"DIO0\"", "folder \"Inputs\"",
-                              "tioAttrBag: resource=/DIO0", "tioAttrBag: resource=/AI0",
-                              "tioResourceStatus: bound"})
+    for (const char* piece :
+         {"project \"p\"", "Tangent I/O item \"DIO0\"", "folder \"Inputs\"",
+          "tioAttrBag: resource=/DIO0", "tioAttrBag: resource=/AI0", "tioResourceStatus: bound"})
         EXPECT_NE(listing.find(piece), std::string::npos) << piece << "\n" << listing;
     // The folder is reused, not made twice.
     ASSERT_EQ(Add(p, {"T", "DIO0", "Inputs/Other"}), kProjectOk) << p.err.str();

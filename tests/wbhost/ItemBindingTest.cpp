@@ -143,8 +143,8 @@ TEST_F(ItemBindingTest, AnItemFollowsItsResourceThroughRenamesRemovalAndReturn) 
     ASSERT_EQ(Tree().RemoveChild(Tree().Root(), u"Front"), S_OK);
     EXPECT_EQ(Status(item), 1);
     EXPECT_EQ(As<IqxItemUI>(item)->IsValid(), S_FALSE);
-    ASSERT_EQ(Tree().InsertSubTree(Tree().Root(),
-                                   u"<Connector name=\"Front\"><Line name=\"Valve0\"/></Connector>"),
+    ASSERT_EQ(Tree().InsertSubTree(
+                  Tree().Root(), u"<Connector name=\"Front\"><Line name=\"Valve0\"/></Connector>"),
               S_OK);
     EXPECT_EQ(Status(item), 0);
     EXPECT_EQ(Tree().QueryReservation(Node(u"/Front/Valve0"), item), S_OK);
@@ -193,12 +193,11 @@ TEST_F(ItemBindingTest, TheCompileConfigurationSpellsOutWhatCompiledCodeDependsO
     ProjectItem* item = AddItem(u"A", u"/C0/DIO0");
     // Attributes in name order ("Note" does not affect compilation, "Kept" does), trimmed; the
     // status; the signed members with their other attributes; the method types.
-    EXPECT_EQ(Config(item->Object()),
-              u"Kept=k;resource=/C0/DIO0;Speed=fast;0"
-              u";<Method name=\"Read\"><Kind>sync</Kind></Method>"
-              u";<Method name=\"Write\"></Method>"
-              u";<Property name=\"Mode\"></Property>"
-              u";ReadMethodType=Boolean;WriteMethodType=Boolean");
+    EXPECT_EQ(Config(item->Object()), u"Kept=k;resource=/C0/DIO0;Speed=fast;0"
+                                      u";<Method name=\"Read\"><Kind>sync</Kind></Method>"
+                                      u";<Method name=\"Write\"></Method>"
+                                      u";<Property name=\"Mode\"></Property>"
+                                      u";ReadMethodType=Boolean;WriteMethodType=Boolean");
     EXPECT_EQ(Icon(item), u"Board.png");
 
     // A resource marked "HiddenTIO" in capitals hides its item, for good.
@@ -267,10 +266,10 @@ TEST_F(ItemBindingTest, FailingHostCallsComeBackAsStatusesAndLoseNothing) {
     // A reservation the host cannot make refuses the new item: nothing of it stays behind.
     Tree().FailReservations(E_ACCESSDENIED);
     ComPtr<ProjectItem> refused;
-    EXPECT_EQ(Project().CreateItem(*target.Get(), tio::kIOItemType, u"A",
-                                   {{u"tioAttrBag",
-                                     Property{Property::Kind::String, BagFor(u"/C0/DIO0"), 0}}},
-                                   &refused),
+    EXPECT_EQ(Project().CreateItem(
+                  *target.Get(), tio::kIOItemType, u"A",
+                  {{u"tioAttrBag", Property{Property::Kind::String, BagFor(u"/C0/DIO0"), 0}}},
+                  &refused),
               E_ACCESSDENIED);
     EXPECT_TRUE(target->Children().empty());
     EXPECT_TRUE(Tree().ReservingItems(Node(u"/C0/DIO0"), nullptr).empty());

@@ -1,8 +1,8 @@
 // The host's project items: tree operations, property bags, enumeration and targets.
 #include "ProjectTestSupport.h"
-#include "project/FolderObject.h"
 #include "host/contracts/IwbProjectItemUIMap.h"
 #include "host/contracts/IwbhwResourceTreeNode.h"
+#include "project/FolderObject.h"
 #include "project/Project.h"
 
 #include <gtest/gtest.h>

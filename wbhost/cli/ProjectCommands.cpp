@@ -90,8 +90,8 @@ ProjectItem* NewIOItem(project::Project& project, ProjectItem& target, ProjectIt
     project::Property text;
     text.text = bag;
     qv::com::ComPtr<ProjectItem> item;
-    if (const HRESULT made = project.CreateItem(parent, tio::kIOItemType, name,
-                                                {{u"tioAttrBag", text}}, &item);
+    if (const HRESULT made =
+            project.CreateItem(parent, tio::kIOItemType, name, {{u"tioAttrBag", text}}, &item);
         FAILED(made)) {
         err << "wbhost: the module's provider cannot make a Tangent I/O item now (status "
             << HexStatus(made) << ")\n";
@@ -225,10 +225,9 @@ int RunAddItem(const HostOptions& options, const std::string& projectPath,
     ProjectItem* parent = target;
     for (size_t i = 0; i + 1 < parts.size() && parent != nullptr; ++i)
         parent = FolderIn(*parent, parts[i], err);
-    ProjectItem* item = parent == nullptr
-                            ? nullptr
-                            : NewIOItem(project, *target, *parent, parts.back(),
-                                        NewItemAttributeSet(place, resource), err);
+    ProjectItem* item = parent == nullptr ? nullptr
+                                          : NewIOItem(project, *target, *parent, parts.back(),
+                                                      NewItemAttributeSet(place, resource), err);
     if (item == nullptr)
         return kProjectFailed;
     if (!SaveProject(session, projectPath, err))

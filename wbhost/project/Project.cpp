@@ -1,10 +1,10 @@
 // The embedded host's project.
 #include "project/Project.h"
 
-#include "kern/Guid.h"
-#include "kern/Utf8.h"
 #include "framework/IqxBindable.h"
 #include "framework/IqxItemUI.h"
+#include "kern/Guid.h"
+#include "kern/Utf8.h"
 #include "project/AtomicFile.h"
 #include "project/FolderObject.h"
 #include "project/HexStatus.h"
@@ -208,7 +208,8 @@ SavedProject Project::Snapshot() const {
         entry.type = item->Type();
         entry.flags = item->Flags();
         entry.name = item->Name();
-        entry.parent = item->Parent() != nullptr ? indexOf.at(item->Parent()) : SavedItem::kNoParent;
+        entry.parent =
+            item->Parent() != nullptr ? indexOf.at(item->Parent()) : SavedItem::kNoParent;
         entry.descriptionFile = item->DescriptionFile();
         entry.properties = item->Bag().Properties();
         indexOf.emplace(item, saved.items.size());
