@@ -11,22 +11,7 @@ namespace wbhw {
 namespace {
 using namespace test;
 
-TEST(ResTreeNode, UnorderedNodesKeepOneEntryPerNameRegardlessOfCase) {
-    ResTreeNode node(u"n", u"IOResource", false);
-    EXPECT_TRUE(node.AddText(node.End(), u"Pin", u"1").inserted);
-    const auto again = node.AddText(node.End(), u"PIN", u"2");
-    EXPECT_FALSE(again.inserted);
-    EXPECT_EQ(*again.position->Text(), u"1");
-    node.AddText(node.End(), u"alpha", u"");
-    node.AddText(node.End(), u"Beta", u"");
-    EXPECT_EQ(Names(node), (std::vector<std::u16string>{u"alpha", u"Beta", u"Pin"}));
-    // An existing name of another kind is answered as it is.
-    const auto child = node.AddChild(node.End(), u"pin", u"X", false);
-    EXPECT_FALSE(child.created);
-    EXPECT_EQ(child.node, nullptr);
-}
-
-TEST(ResTreeNode, UnorderedNodesSortManyNamesAndAnswerTheFirstOfEachSpelling) {
+TEST(ResTreeNode, UnorderedNodesKeepOneEntryPerNameSortedAndAnswerTheFirstSpelling) {
     ResTreeNode node(u"n", u"IOResource", false);
     // Names arrive out of order, and every fourth one again in other case.
     for (int i = 0; i < 200; ++i) {
@@ -41,10 +26,15 @@ TEST(ResTreeNode, UnorderedNodesSortManyNamesAndAnswerTheFirstOfEachSpelling) {
                 c = (c >= u'a' && c <= u'z') ? static_cast<char16_t>(c - 32) : c;
             const auto again = node.AddChild(node.End(), upper, u"X", false);
             EXPECT_FALSE(again.created);
+            EXPECT_EQ(again.node, nullptr); // a text of that name is answered as it is
             EXPECT_EQ(again.position->Name(), name);
         }
     }
     EXPECT_EQ(node.EntryCount(), 200u);
+    // A text of a name already there keeps the first one's value.
+    const auto again = node.AddText(node.End(), u"PINAA", u"second");
+    EXPECT_FALSE(again.inserted);
+    EXPECT_EQ(*again.position->Text(), u"first");
     const std::vector<std::u16string> names = Names(node);
     for (size_t i = 1; i < names.size(); ++i)
         EXPECT_LT(qv::kern::CompareNoCase(names[i - 1], names[i]), 0) << i;
