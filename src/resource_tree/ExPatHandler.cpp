@@ -83,6 +83,15 @@ unsigned long ExPatHandler::CurrentColumn() const noexcept {
     return XML_GetCurrentColumnNumber(parser_.get());
 }
 
+uint64_t ExPatHandler::KeptBytes(uint64_t fed) const noexcept {
+    // Between calls Expat's current position is where its next token starts, and that is where
+    // it will start scanning again when the next block arrives.
+    const XML_Index at = XML_GetCurrentByteIndex(parser_.get());
+    if (at < 0 || static_cast<uint64_t>(at) > fed)
+        return 0;
+    return fed - static_cast<uint64_t>(at);
+}
+
 std::string_view ExPatHandler::InputContext(int& offset) const noexcept {
     int size = 0;
     offset = 0;

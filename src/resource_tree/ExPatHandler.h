@@ -3,6 +3,7 @@
 
 #include "resource_tree/XmlAttributes.h"
 
+#include <cstdint>
 #include <exception>
 #include <expat.h>
 #include <memory>
@@ -50,6 +51,9 @@ public:
     unsigned long CurrentLine() const noexcept;
     // The parser's current column, counted from 0.
     unsigned long CurrentColumn() const noexcept;
+    // How many of the FED bytes handed over so far Expat still keeps unparsed: the start of a
+    // token that the last block cut off. 0 when Expat reports no position.
+    uint64_t KeptBytes(uint64_t fed) const noexcept;
     // The bytes of the input that Expat still holds around the current position, and in OFFSET
     // the position within them; empty when Expat keeps no context.
     std::string_view InputContext(int& offset) const noexcept;

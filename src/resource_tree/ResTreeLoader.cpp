@@ -3,11 +3,11 @@
 #include "resource_tree/ListText.h"
 #include "resource_tree/ParseStack.h"
 
-#include <array>
 #include <cerrno>
 #include <fcntl.h>
 #include <sys/stat.h>
 #include <unistd.h>
+#include <vector>
 
 namespace wbhw {
 namespace {
@@ -133,7 +133,8 @@ int32_t ResTreeNode::ParseFile(const std::string& path, bool asChild, ResTreeNod
     if (file.get() < 0 || fstat(file.get(), &info) != 0 || !S_ISREG(info.st_mode))
         return kFail;
     return RunLoad(*this, scope, asChild, out, FromUtf8Lenient(path), [&file](ParseStack& stack) {
-        std::array<char, kBlockSize> block;
+        std::vector<char> block(kBlockSize);
+        uint64_t fed = 0;
         for (;;) {
             const size_t n = ReadBlock(file.get(), block.data(), block.size());
             const bool last = n < block.size();
@@ -141,6 +142,14 @@ int32_t ResTreeNode::ParseFile(const std::string& path, bool asChild, ResTreeNod
                 return false;
             if (last)
                 return true;
+            fed += n;
+            // Expat scans a token that a block cut off again from its start with every further
+            // block. A block at least as large as what it keeps makes each scan cover at least
+            // half new bytes, so a huge token (a name or a value of megabytes) costs linear time
+            // instead of quadratic.
+            const uint64_t kept = stack.KeptBytes(fed);
+            if (kept > block.size())
+                block.resize(static_cast<size_t>(kept));
         }
     });
 }
