@@ -50,11 +50,14 @@ void BM_CachedCompareOldestOfHundred(benchmark::State& state) {
 
 // The cache alone: a lookup of the oldest of 100 long keys that share long prefixes.
 void BM_CacheLookupOnly(benchmark::State& state) {
-    wbhw::CompareCache cache(100);
-    std::u16string tail(4000, u'x');
-    for (int i = 0; i < 100; ++i)
-        cache.Insert({tail + char16_t(u'A' + i % 26) + char16_t(u'0' + i / 26), tail}, 0);
-    const wbhw::CompareCache::Key key(tail + u"A0", tail);
+    wbhw::CompareCache cache(100, wbhw::kCompareCacheBytes);
+    std::string tail(4000, 'x');
+    for (int i = 0; i < 100; ++i) {
+        const std::string first = tail + char('A' + i % 26) + char('0' + i / 26);
+        cache.Insert(wbhw::CompareCache::Key(wbhw::CompareCache::Probe(first, tail)), 0);
+    }
+    const std::string first = tail + "A0";
+    const wbhw::CompareCache::Probe key(first, tail);
     for (auto _ : state)
         benchmark::DoNotOptimize(cache.Find(key));
 }

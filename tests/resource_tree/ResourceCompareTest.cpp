@@ -94,6 +94,100 @@ TEST(ResourceCompare, RepeatedNamesInOrderedNodesPairUpInOrder) {
     EXPECT_EQ(Compare(Resource(twice), Resource(swapped)), kNotSatisfied);
 }
 
+TEST(ResourceCompare, AnEmptyListAsksForNothing) {
+    const auto sv = [](const std::string& list) {
+        return Resource("<SupportedValues>" + list + "</SupportedValues>");
+    };
+    EXPECT_EQ(Compare(sv(""), sv("1,2")), kToleratedDifference);
+    EXPECT_EQ(Compare(sv(""), sv("")), kMatch);
+    EXPECT_EQ(Compare(sv("1,2"), sv("")), kNotSatisfied);
+    EXPECT_EQ(Compare(sv(","), sv("")), kNotSatisfied) << "two empty pieces are still asked for";
+}
+
+TEST(ResourceCompare, LocalizedEntriesTakeNoPartInOrderedPairing) {
+    const auto steps = [](const std::string& body) {
+        return Resource("<Steps name='Steps' ordered='true'>" + body + "</Steps>");
+    };
+    const std::string localized = "<Description localize='true'>eng=Read</Description>";
+    const std::string plain = "<Description>read</Description>";
+    const std::string both = steps(localized + plain);
+    EXPECT_EQ(Compare(both, both), kMatch) << "identical descriptions always compare 0";
+    EXPECT_EQ(Compare(both, steps(plain)), kMatch) << "a missing translation changes nothing";
+    EXPECT_EQ(Compare(steps(plain), both), kMatch);
+    EXPECT_EQ(Compare(both, steps(localized + "<Description>write</Description>")), kNotSatisfied);
+}
+
+TEST(ResourceCompare, LongListsAndLongRepeatsCompareInPlainTime) {
+    // Hostile sizes for a walk that searches every required piece in the whole offered list, or
+    // scans for the k-th entry of a name from the start; either made these take minutes.
+    std::string required;
+    std::string offered;
+    for (int i = 0; i < 40000; ++i) {
+        required += (i != 0 ? "," : "") + std::to_string(i);
+        offered += (i != 0 ? "," : "") + std::to_string(39999 - i);
+    }
+    const auto sv = [](const std::string& list) {
+        return Resource("<SupportedValues>" + list + "</SupportedValues>");
+    };
+    EXPECT_EQ(Compare(sv(required), sv(offered)), kMatch);
+    EXPECT_EQ(Compare(sv(required + ",x"), sv(offered)), kNotSatisfied);
+    std::string repeats;
+    for (int i = 0; i < 20000; ++i)
+        repeats += "<Pin>" + std::to_string(i % 2) + "</Pin>";
+    const std::string ordered = "<Pins name='P' ordered='true'>" + repeats + "</Pins>";
+    const std::string shifted = "<Pins name='P' ordered='true'><Other/>" + repeats + "</Pins>";
+    EXPECT_EQ(Compare(Resource(ordered), Resource(shifted)), kToleratedDifference);
+    const std::string swapped =
+        "<Pins name='P' ordered='true'><Other/><Pin>1</Pin>" + repeats.substr(12) + "</Pins>";
+    EXPECT_EQ(Compare(Resource(ordered), Resource(swapped)), kNotSatisfied);
+}
+
+TEST(ResourceCompare, TheExplanationComesFromTheWalkThatAnswers) {
+    const std::string required = Resource("<Direction>Input</Direction>"
+                                          "<Group name='G'><Rate>fast</Rate>"
+                                          "<SupportedValues>1,2</SupportedValues></Group>");
+    CompareExplanation why;
+    EXPECT_EQ(CompareResourceTexts(required, required, &why), kMatch);
+    EXPECT_EQ(why.result, kMatch);
+    EXPECT_TRUE(why.findings.empty());
+
+    const std::string slower = Resource("<Direction>Input</Direction>"
+                                        "<Group name='G'><Rate>slow</Rate>"
+                                        "<SupportedValues>1,2</SupportedValues></Group>");
+    EXPECT_EQ(CompareResourceTexts(required, slower, &why), kNotSatisfied);
+    ASSERT_NE(why.Shortfall(), nullptr);
+    EXPECT_EQ(why.Shortfall()->reason, CompareReason::TextDiffers);
+    EXPECT_EQ(why.Shortfall()->path, u"/G/Rate");
+    EXPECT_EQ(why.Shortfall()->required, u"fast");
+    EXPECT_EQ(why.Shortfall()->offered, u"slow");
+
+    const std::string richer = Resource("<Direction>Input</Direction><Extra>1</Extra>"
+                                        "<Group name='G'><Rate>fast</Rate>"
+                                        "<SupportedValues>1,2,3</SupportedValues></Group>");
+    EXPECT_EQ(CompareResourceTexts(required, richer, &why), kToleratedDifference);
+    ASSERT_EQ(why.findings.size(), 2u);
+    EXPECT_EQ(why.findings[0].reason, CompareReason::OfferedExtra);
+    EXPECT_EQ(why.findings[0].path, u"/Extra");
+    EXPECT_EQ(why.findings[1].reason, CompareReason::ListLengthDiffers);
+    EXPECT_EQ(why.findings[1].offered, u"1,2,3");
+
+    EXPECT_EQ(CompareResourceTexts(richer, required, &why), kNotSatisfied);
+    ASSERT_NE(why.Shortfall(), nullptr);
+    EXPECT_EQ(why.Shortfall()->reason, CompareReason::Missing);
+    EXPECT_EQ(why.Shortfall()->path, u"/Extra");
+
+    const std::string fewer = Resource("<Direction>Input</Direction>"
+                                       "<Group name='G'><Rate>fast</Rate>"
+                                       "<SupportedValues>2</SupportedValues></Group>");
+    EXPECT_EQ(CompareResourceTexts(required, fewer, &why), kNotSatisfied);
+    ASSERT_NE(why.Shortfall(), nullptr);
+    EXPECT_EQ(why.Shortfall()->reason, CompareReason::ValueMissing);
+    EXPECT_EQ(why.Shortfall()->piece, u"1");
+    EXPECT_EQ(CompareResourceTexts("", required, &why), kToleratedDifference);
+    ASSERT_EQ(why.findings.size(), 1u);
+    EXPECT_EQ(why.findings[0].reason, CompareReason::RequiredEmpty);
+}
+
 TEST(ResourceCompare, BrokenDocumentsStillCompare) {
     EXPECT_EQ(Compare(Resource("<A>1</A>"), "<IOResource><A>1</A>"), kToleratedDifference);
     EXPECT_EQ(Compare("<IOResource><A>1</A>", "<IOResource><A>1</A>"), kMatch);
@@ -125,18 +219,38 @@ TEST(ResourceCompare, CachedAnswersAreReusedUntilPushedOutByNewerPairs) {
     ClearCompareCache();
 }
 
-TEST(CompareCache, KeepsTheMostRecentDistinctPairsExactly) {
-    CompareCache cache(3);
-    cache.Insert({u"a", u"b"}, 1);
-    EXPECT_EQ(cache.Find({u"a", u"b"}), 1u);
-    EXPECT_FALSE(cache.Find({u"A", u"b"}).has_value()) << "keys are exact, case and all";
-    EXPECT_FALSE(cache.Find({u"b", u"a"}).has_value());
-    cache.Insert({u"c", u"d"}, 2);
-    cache.Insert({u"e", u"f"}, 0);
-    cache.Insert({u"g", u"h"}, 2);
+TEST(CompareCache, KeepsTheMostRecentDistinctPairsWithinCountAndBytes) {
+    using Probe = CompareCache::Probe;
+    const auto insert = [](CompareCache& cache, std::string_view a, std::string_view b,
+                           uint32_t result) {
+        cache.Insert(CompareCache::Key(Probe(a, b)), result);
+    };
+    CompareCache cache(3, 100);
+    insert(cache, "a", "b", 1);
+    EXPECT_EQ(cache.Find(Probe("a", "b")), 1u);
+    EXPECT_FALSE(cache.Find(Probe("A", "b")).has_value()) << "keys are exact, case and all";
+    EXPECT_FALSE(cache.Find(Probe("b", "a")).has_value());
+    insert(cache, "c", "d", 2);
+    insert(cache, "e", "f", 0);
+    insert(cache, "a", "b", 2); // computed again: kept once, as the newest
+    insert(cache, "g", "h", 2);
     EXPECT_EQ(cache.size(), 3u);
-    EXPECT_FALSE(cache.Find({u"a", u"b"}).has_value());
-    EXPECT_EQ(cache.Find({u"g", u"h"}), 2u);
+    EXPECT_FALSE(cache.Find(Probe("c", "d")).has_value());
+    EXPECT_EQ(cache.Find(Probe("a", "b")), 2u);
+
+    // The byte budget: the oldest pairs go first, and a pair larger than the budget is not kept.
+    const std::string forty(40, 'x');
+    insert(cache, forty, "1", 0);
+    insert(cache, forty, "2", 0);
+    EXPECT_EQ(cache.size(), 3u);
+    insert(cache, std::string(30, 'z'), "3", 0);
+    EXPECT_EQ(cache.size(), 2u) << "82 + 31 bytes exceed the budget";
+    EXPECT_EQ(cache.bytes(), 72u);
+    EXPECT_FALSE(cache.Find(Probe(forty, "1")).has_value());
+    EXPECT_TRUE(cache.Find(Probe(forty, "2")).has_value());
+    insert(cache, std::string(61, 'y'), forty, 1);
+    EXPECT_FALSE(cache.Find(Probe(std::string(61, 'y'), forty)).has_value());
+    EXPECT_EQ(cache.size(), 2u);
 }
 
 TEST(ResourceCompareConcurrency, ThreadsGetTheSingleThreadedAnswers) {
