@@ -110,14 +110,18 @@ int32_t RefuseTooDeep(ResTreeNode& node, LoadScope& scope, std::u16string_view w
 
 int32_t ResTreeNode::ParseText(std::u16string_view text, bool asChild, ResTreeNode** out,
                                const LoaderSettings* settings) {
+    return ParseUtf8(qv::kern::WideToStandardUtf8(text), asChild, out, settings);
+}
+
+int32_t ResTreeNode::ParseUtf8(std::string_view utf8, bool asChild, ResTreeNode** out,
+                               const LoaderSettings* settings) {
     if (out != nullptr)
         *out = nullptr;
     LoadScope scope(settings, true);
     if (scope.IsTooDeep())
         return RefuseTooDeep(*this, scope, u"text");
-    return RunLoad(*this, scope, asChild, out, std::u16string(), [text](ParseStack& stack) {
-        return stack.Parse(qv::kern::WideToStandardUtf8(text), true);
-    });
+    return RunLoad(*this, scope, asChild, out, std::u16string(),
+                   [utf8](ParseStack& stack) { return stack.Parse(utf8, true); });
 }
 
 int32_t ResTreeNode::ParseFile(const std::string& path, bool asChild, ResTreeNode** out,

@@ -219,6 +219,9 @@ public:
     // written to "XMLParseErrors"). OUT, when given, receives this node or the new child, or null.
     int32_t ParseText(std::u16string_view text, bool asChild, ResTreeNode** out = nullptr,
                       const LoaderSettings* settings = nullptr);
+    // ParseText for a document already in UTF-8: Expat reads the bytes as they are.
+    int32_t ParseUtf8(std::string_view utf8, bool asChild, ResTreeNode** out = nullptr,
+                      const LoaderSettings* settings = nullptr);
     // The same for the document in the file PATH, read in blocks of 4096 bytes (larger while a
     // token spans blocks, which keeps a huge token linear); a file that
     // cannot be opened answers 0x80004005 without a message.

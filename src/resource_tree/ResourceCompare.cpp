@@ -2,11 +2,13 @@
 // answers that many threads share.
 #include "resource_tree/ResourceCompare.h"
 
+#include "kern/AsciiRun.h"
 #include "kern/CodePage.h"
 #include "resource_tree/CompareCache.h"
 #include "resource_tree/CompareWalk.h"
 #include "resource_tree/ResTreeNode.h"
 
+#include <array>
 #include <mutex>
 
 namespace wbhw {
@@ -23,10 +25,30 @@ CompareCache& Cache() {
     return cache;
 }
 
-// Loads one description into a fresh root of TYPE. Whatever a load builds takes part,
-// "XMLParseErrors" included: a document that fails to load still compares, and differs from one
-// that loads. Each text is decoded just before its load, so only one wide copy lives at a time.
+// True when the code page reads every ASCII byte as that character, as all the pages we name
+// do (a page named by the environment need not).
+bool CodePageKeepsAscii() {
+    std::array<char, 128> ascii{};
+    for (size_t i = 0; i < ascii.size(); ++i)
+        ascii[i] = static_cast<char>(i);
+    const std::u16string wide = qv::kern::AnsiToWide(std::string_view(ascii.data(), ascii.size()));
+    for (size_t i = 0; i < wide.size(); ++i) {
+        if (static_cast<size_t>(wide[i]) != i)
+            return false;
+    }
+    return wide.size() == ascii.size();
+}
+
+// Loads one description into a fresh root. Whatever a load builds takes part, "XMLParseErrors"
+// included: a document that fails to load still compares, and differs from one that loads.
+// Descriptions are nearly always ASCII, and then their bytes are already the UTF-8 that Expat
+// reads: no wide copy and no second conversion. Other texts are decoded just before their load,
+// so only one wide copy lives at a time.
 void LoadRoot(ResTreeNode& root, std::string_view text) {
+    if (qv::kern::AsciiPrefixLength(text) == text.size() && CodePageKeepsAscii()) {
+        root.ParseUtf8(text, false);
+        return;
+    }
     root.ParseText(qv::kern::AnsiToWide(text), false);
 }
 

@@ -5,6 +5,7 @@
 #include "TreeTestSupport.h"
 #include "resource_tree/CompareCache.h"
 
+#include <algorithm>
 #include <gtest/gtest.h>
 #include <string>
 #include <thread>
@@ -253,28 +254,68 @@ TEST(CompareCache, KeepsTheMostRecentDistinctPairsWithinCountAndBytes) {
     EXPECT_EQ(cache.size(), 2u);
 }
 
+TEST(ResourceCompare, TheCacheKeepsLargePairsWithinItsByteBudget) {
+    // 100 distinct pairs of 1.25 MB texts would keep 250 MB; the oldest go first.
+    ClearCompareCache();
+    const std::string filler(1250000, 'c');
+    for (int i = 0; i < 100; ++i) {
+        const std::string a = "<R><!--" + filler + "--><N>" + std::to_string(i) + "</N></R>";
+        EXPECT_EQ(Compare(a, a), kMatch);
+    }
+    EXPECT_LE(CompareCacheBytes(), kCompareCacheBytes);
+    EXPECT_GE(CompareCacheBytes(), kCompareCacheBytes - 2 * 1250100);
+    ClearCompareCache();
+    EXPECT_EQ(CompareCacheBytes(), 0u);
+}
+
+// A description of N resources, each with a few entries that SEED varies.
+std::string LargeResource(int n, int seed) {
+    std::string body;
+    for (int r = 0; r < n; ++r) {
+        body += "<IOResource name='R" + std::to_string(r) + "'><Line>" + std::to_string(r) +
+                "</Line><SupportedValues>1," + std::to_string(2 + (r + seed) % 3) +
+                "</SupportedValues><MemoryLatency>" + std::to_string(3 + (r * seed) % 2) +
+                "</MemoryLatency><Steps name='S' ordered='true'><Op>read</Op><Op>write</Op>"
+                "</Steps></IOResource>";
+    }
+    return "<Target>" + body + "</Target>";
+}
+
 TEST(ResourceCompareConcurrency, ThreadsGetTheSingleThreadedAnswers) {
+    // Small pairs that threads often share, and large ones whose loads overlap in time; the
+    // lock is held only for the cache, so loads and walks of different pairs run side by side.
     std::vector<std::pair<std::string, std::string>> pairs;
-    for (int i = 0; i < 150; ++i) {
+    for (int i = 0; i < 120; ++i) {
         const std::string n = std::to_string(i % 7);
         pairs.emplace_back(Resource("<SupportedValues>" + n + "</SupportedValues>"),
                            Resource("<SupportedValues>" + n + "," + std::to_string(i % 3) +
                                     "</SupportedValues><Pin>" + std::to_string(i) + "</Pin>"));
     }
+    for (int i = 0; i < 12; ++i)
+        pairs.emplace_back(LargeResource(300, i % 4), LargeResource(300, i % 5));
     ClearCompareCache();
     std::vector<uint32_t> expected;
     for (const auto& [a, b] : pairs)
         expected.push_back(Compare(a, b));
+    for (const uint32_t answer : {kMatch, kNotSatisfied, kToleratedDifference})
+        EXPECT_NE(std::count(expected.begin(), expected.end(), answer), 0);
     ClearCompareCache();
 
+    constexpr size_t kThreads = 6;
     std::vector<std::thread> threads;
-    std::vector<int> wrong(4, 0);
-    for (size_t t = 0; t < wrong.size(); ++t) {
+    std::vector<int> wrong(kThreads, 0);
+    for (size_t t = 0; t < kThreads; ++t) {
         threads.emplace_back([&, t] {
-            for (size_t round = 0; round < 3; ++round) {
-                for (size_t i = t; i < pairs.size(); i += 2) {
+            for (size_t round = 0; round < 2; ++round) {
+                // Threads t and t + 3 take the same pairs, in opposite orders.
+                for (size_t k = 0; k < pairs.size(); ++k) {
+                    const size_t i = t < 3 ? k : pairs.size() - 1 - k;
+                    if (i % 3 != t % 3)
+                        continue;
                     if (Compare(pairs[i].first, pairs[i].second) != expected[i])
                         ++wrong[t];
+                    if (i % 10 == 0)
+                        ClearCompareCache();
                 }
             }
         });
@@ -283,6 +324,7 @@ TEST(ResourceCompareConcurrency, ThreadsGetTheSingleThreadedAnswers) {
         thread.join();
     for (const int w : wrong)
         EXPECT_EQ(w, 0);
+    EXPECT_LE(CompareCacheBytes(), kCompareCacheBytes);
 }
 
 } // namespace
