@@ -114,6 +114,21 @@ void BM_HostCost(benchmark::State& state) {
     state.counters["destroy_vs_load"] = g_summary["destroy / load, " + size] = Median(destroy);
 }
 
+// The walk alone, over the same two loaded trees again and again (what a profile of the walk
+// wants to see).
+void BM_WalkOnly(benchmark::State& state) {
+    const auto resources = static_cast<size_t>(state.range(0));
+    wbhw::ResTreeNode a(wbhw::WString(), u"userData1", false);
+    wbhw::ResTreeNode b(wbhw::WString(), u"userData2", false);
+    a.ParseUtf8(TargetDescription(resources, 1), false);
+    b.ParseUtf8(TargetDescription(resources, 2), false);
+    for (auto _ : state)
+        benchmark::DoNotOptimize(wbhw::CompareNodes(&a, &b));
+    state.counters["ns_per_resource"] =
+        benchmark::Counter(static_cast<double>(state.iterations() * resources),
+                           benchmark::Counter::kIsRate | benchmark::Counter::kInvert);
+}
+
 // Hostile inputs: one list of N pieces, and an ordered node repeating one name N times whose
 // offered copy is shifted by one entry, so that nothing pairs by place. Reports the time per
 // piece or entry; a linear walk keeps it flat from 10k to 40k.
@@ -183,6 +198,7 @@ void BM_Parallel(benchmark::State& state) {
 
 BENCHMARK(BM_HostCost)->Arg(2000)->Iterations(15)->Unit(benchmark::kMillisecond);
 BENCHMARK(BM_HostCost)->Arg(16000)->Iterations(5)->Unit(benchmark::kMillisecond);
+BENCHMARK(BM_WalkOnly)->Arg(2000)->Unit(benchmark::kMillisecond);
 BENCHMARK(BM_LongList)->Arg(10000)->Arg(40000)->Unit(benchmark::kMillisecond);
 BENCHMARK(BM_Repeats)->Arg(10000)->Arg(40000)->Unit(benchmark::kMillisecond);
 BENCHMARK(BM_Parallel)->Threads(1)->Threads(2)->UseRealTime()->MinTime(2.0);

@@ -204,9 +204,8 @@ uint32_t CompareWalk::Nodes(ResTreeNode* a, ResTreeNode* b) {
     if (b == nullptr)
         return kNotSatisfied;
     LoadAllDeferred(*b);
-    Tally tally;
-    tally.unmatched = CountComparedEntries(*b);
     LoadAllDeferred(*a);
+    Tally tally;
     const uint32_t walked = !a->IsOrdered() && !b->IsOrdered() ? SortedEntries(*a, *b, tally)
                                                                : SequencedEntries(*a, *b, tally);
     if (walked == kNotSatisfied)
@@ -215,7 +214,8 @@ uint32_t CompareWalk::Nodes(ResTreeNode* a, ResTreeNode* b) {
 }
 
 // Both nodes keep their entries sorted by name in the collator's order, one entry per name:
-// one pass over both pairs them.
+// one pass over both pairs them. Every entry of b is either paired or passed over; those passed
+// over that take part are the ones a leaves unmatched.
 uint32_t CompareWalk::SortedEntries(ResTreeNode& a, ResTreeNode& b, Tally& tally) {
     auto f = b.Begin();
     const auto bEnd = b.End();
@@ -224,7 +224,7 @@ uint32_t CompareWalk::SortedEntries(ResTreeNode& a, ResTreeNode& b, Tally& tally
             continue;
         int order = -1;
         while (f != bEnd && (order = CompareNames(f->Name(), e->Name())) < 0)
-            NoteExtra(b, *f++);
+            PassOver(b, *f++, tally);
         if (f == bEnd || order != 0)
             return Short(CompareReason::Missing, a, *e, nullptr);
         const ResTreeEntry& counterpart = *f++;
@@ -234,10 +234,8 @@ uint32_t CompareWalk::SortedEntries(ResTreeNode& a, ResTreeNode& b, Tally& tally
         if (Pair(a, *e, counterpart, tally) == kNotSatisfied)
             return kNotSatisfied;
     }
-    if (why_ != nullptr) {
-        for (; f != bEnd; ++f)
-            NoteExtra(b, *f);
-    }
+    for (; f != bEnd; ++f)
+        PassOver(b, *f, tally);
     return kMatch;
 }
 
@@ -245,6 +243,7 @@ uint32_t CompareWalk::SortedEntries(ResTreeNode& a, ResTreeNode& b, Tally& tally
 // the same places, the k-th entry of each name sits at the same place on both sides, so they
 // pair place by place; from the first disagreement on, a name index of b pairs the rest.
 uint32_t CompareWalk::SequencedEntries(ResTreeNode& a, ResTreeNode& b, Tally& tally) {
+    tally.unmatched = CountComparedEntries(b);
     auto e = a.Begin();
     auto f = b.Begin();
     for (; e != a.End() && f != b.End() && SameSlot(*e, *f); ++e, ++f) {
@@ -252,6 +251,7 @@ uint32_t CompareWalk::SequencedEntries(ResTreeNode& a, ResTreeNode& b, Tally& ta
             continue;
         if (Pair(a, *e, *f, tally) == kNotSatisfied)
             return kNotSatisfied;
+        --tally.unmatched;
     }
     if (e != a.End())
         return RestThroughIndex(a, e, b, tally);
@@ -280,6 +280,7 @@ uint32_t CompareWalk::RestThroughIndex(ResTreeNode& a, ResTreeNode::Position e, 
             return Short(CompareReason::Missing, a, *e, nullptr);
         if (Pair(a, *e, *f, tally) == kNotSatisfied)
             return kNotSatisfied;
+        --tally.unmatched;
     }
     if (why_ != nullptr)
         counterparts.ForEachUnpaired([this, &b](const ResTreeEntry& f) { NoteExtra(b, f); });
@@ -305,7 +306,6 @@ uint32_t CompareWalk::Pair(const ResTreeNode& a, const ResTreeEntry& e, const Re
             return kNotSatisfied;
         tally.minor = tally.minor || below == kToleratedDifference;
     }
-    --tally.unmatched;
     return kMatch;
 }
 
@@ -368,6 +368,13 @@ void CompareWalk::Tolerate(CompareReason reason, const ResTreeNode& node, const 
         why_->findings.push_back(CompareFinding{reason, EntryPath(node, entry), TextOrEmpty(&entry),
                                                 TextOrEmpty(offered), std::u16string()});
     }
+}
+
+void CompareWalk::PassOver(const ResTreeNode& b, const ResTreeEntry& f, Tally& tally) {
+    if (IsIgnored(f))
+        return;
+    ++tally.unmatched;
+    NoteExtra(b, f);
 }
 
 void CompareWalk::NoteExtra(const ResTreeNode& b, const ResTreeEntry& f) {

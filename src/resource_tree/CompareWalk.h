@@ -45,6 +45,9 @@ private:
                   const ResTreeEntry* offered);
     // Records an offered entry that nothing required, unless it takes no part.
     void NoteExtra(const ResTreeNode& b, const ResTreeEntry& f);
+    // Counts (and records) an entry of b that the sorted walk passed over, unless it takes no
+    // part.
+    void PassOver(const ResTreeNode& b, const ResTreeEntry& f, Tally& tally);
 
     CompareExplanation* why_;
 };
