@@ -255,15 +255,15 @@ TEST(CompareCache, KeepsTheMostRecentDistinctPairsWithinCountAndBytes) {
 }
 
 TEST(ResourceCompare, TheCacheKeepsLargePairsWithinItsByteBudget) {
-    // 100 distinct pairs of 1.25 MB texts would keep 250 MB; the oldest go first.
+    // 100 distinct pairs of 1 MB texts would keep 100 MB; the oldest go first.
     ClearCompareCache();
-    const std::string filler(1250000, 'c');
+    const std::string filler(1000000, 'c');
     for (int i = 0; i < 100; ++i) {
-        const std::string a = "<R><!--" + filler + "--><N>" + std::to_string(i) + "</N></R>";
-        EXPECT_EQ(Compare(a, a), kMatch);
+        const std::string n = "<N>" + std::to_string(i) + "</N>";
+        EXPECT_EQ(Compare(Resource("<!--" + filler + "-->" + n), Resource(n)), kMatch);
     }
     EXPECT_LE(CompareCacheBytes(), kCompareCacheBytes);
-    EXPECT_GE(CompareCacheBytes(), kCompareCacheBytes - 2 * 1250100);
+    EXPECT_GE(CompareCacheBytes(), kCompareCacheBytes - 1000100);
     ClearCompareCache();
     EXPECT_EQ(CompareCacheBytes(), 0u);
 }
