@@ -3,6 +3,8 @@
 
 #include "cli/AttributeSet.h"
 #include "cli/HostText.h"
+#include "framework/IwbCompileConfiguration.h"
+#include "items/TIOItemInterfaces.h"
 #include "kern/Collate.h"
 #include "provider/TIOIdentifiers.h"
 
@@ -33,6 +35,32 @@ std::u16string StoredResource(const project::PropertyBag& bag) {
     return {};
 }
 
+// A text the item's object hands out through GET (a new BSTR); empty when it does not answer.
+template <class Get> std::optional<std::u16string> AskText(Get&& get) {
+    BSTR text = nullptr;
+    if (FAILED(get(&text)))
+        return std::nullopt;
+    const qv::com::UniqueBstr owned(text);
+    return qv::com::BstrToString(text);
+}
+
+// Overwrites what the saved properties said with what the item's object reports, where it does.
+void AskObject(IUnknown* object, ItemState& state) {
+    if (const auto item = qv::com::QueryAs<IwbTIOInstanceItemUI>(object)) {
+        int32_t status = 1;
+        if (SUCCEEDED(item->GetResourceStatus(&status)))
+            state.status = status;
+    }
+    if (const auto resource = qv::com::QueryAs<IwbhwResourceItemUI>(object)) {
+        if (auto path = AskText([&](BSTR* text) { return resource->GetResourcePath(text); }))
+            state.resource = std::move(*path);
+    }
+    if (const auto compile = qv::com::QueryAs<IwbCompileConfiguration>(object)) {
+        state.compileConfiguration =
+            AskText([&](BSTR* text) { return compile->GetCompileConfiguration(text); });
+    }
+}
+
 ItemState StateOf(const project::ProjectItem& item, std::u16string path) {
     ItemState state;
     state.item = &item;
@@ -44,6 +72,7 @@ ItemState StateOf(const project::ProjectItem& item, std::u16string path) {
     state.hidden = (item.Flags() & wbproj::kShownFlag) == 0;
     if (const Property* version = Find(bag, u"tioFeatureSetVersion", Property::Kind::Int))
         state.featureSetVersion = version->number;
+    AskObject(item.Object(), state);
     return state;
 }
 

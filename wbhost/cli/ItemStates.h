@@ -1,5 +1,6 @@
-// What the Tangent I/O items of a target report of themselves, read back after the module has
-// had its say: the state that `project list --json` and every `edit` show.
+// What the Tangent I/O items of a target report of themselves, asked of their objects (the
+// module's items) where they answer and read from their saved properties otherwise: the state
+// that `project list --json` and every `edit` show.
 #pragma once
 
 #include "project/ProjectItem.h"
@@ -21,6 +22,9 @@ struct ItemState {
     std::optional<int32_t> status;
     bool hidden = false;           // the item's shown flag is clear
     int32_t featureSetVersion = 0; // how often its resource's signatures changed
+    // What code built against the item depends on; empty when the item has no object that
+    // tells it.
+    std::optional<std::u16string> compileConfiguration;
 };
 
 // The Tangent I/O items anywhere below TARGET, in tree order.

@@ -21,6 +21,8 @@ json ItemJson(const ItemState& state) {
                  {"statusText", "not reported"},
                  {"hidden", state.hidden},
                  {"featureSetVersion", state.featureSetVersion}};
+    if (state.compileConfiguration)
+        item["compileConfiguration"] = ToUtf8(*state.compileConfiguration);
     if (state.status) {
         const std::string_view word = StatusWord(*state.status);
         item["status"] = *state.status;
