@@ -3,6 +3,8 @@
 
 #include "cli/AttributeSet.h"
 #include "cli/HostText.h"
+#include "com/Bstr.h"
+#include "com/ComPtr.h"
 #include "framework/IwbCompileConfiguration.h"
 #include "items/TIOItemInterfaces.h"
 #include "kern/Collate.h"
