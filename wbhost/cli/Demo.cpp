@@ -9,6 +9,8 @@
 #include <filesystem>
 #include <fstream>
 #include <functional>
+#include <map>
+#include <nlohmann/json.hpp>
 #include <ostream>
 #include <sstream>
 #include <unistd.h>
@@ -128,14 +130,18 @@ private:
     bool temporary_ = false;
 };
 
-// A part the demo inserts into the target: a third connector with one line.
-constexpr const char* kExpansion = R"(<Connector name="Connector2">
-  <DisplayName>Connector 2 (expansion)</DisplayName>
-  <DigitalLine name="DIO0">
-    <Protocols>IOResource,DigitalLine</Protocols>
-    <IOInterface>DigitalLine</IOInterface>
-  </DigitalLine>
-</Connector>
+// The analog input that the demo removes and then puts back, described as the board does.
+constexpr const char* kAnalogInput = R"(<AnalogChannel name="AI2">
+  <Protocols>IOResource,AnalogInput</Protocols>
+  <IOInterface>AnalogInput</IOInterface>
+  <Channel>2</Channel>
+  <MethodSet>
+    <Method name="Read"><Signature>Double Read()</Signature></Method>
+  </MethodSet>
+  <AttributeSet>
+    <Attribute name="Mode"><Value>Calibrated</Value></Attribute>
+  </AttributeSet>
+</AnalogChannel>
 )";
 
 void PlayDescriptions(Transcript& script, const HostOptions& options, const std::string& dir) {
@@ -149,12 +155,13 @@ void PlayDescriptions(Transcript& script, const HostOptions& options, const std:
             },
             6);
     }
-    script.Step("One node of the K-40", "tree " + file("KestrelK40.xml") + " Connector0/DIO3",
-                {0, {"<DigitalLine name=\"DIO3\">", "<Line>3</Line>"}, {"DIO4"}},
-                [&](std::ostream& out, std::ostream& err) {
-                    return RunTree(options.modulePath, file("KestrelK40.xml"), "Connector0/DIO3",
-                                   out, err);
-                });
+    script.Step(
+        "One node of the K-40", "tree " + file("KestrelK40.xml") + " Connector0/DIO3",
+        {0, {"<DigitalLine name=\"DIO3\">", "<Line>3</Line>"}, {"DIO4"}},
+        [&](std::ostream& out, std::ostream& err) {
+            return RunTree(options.modulePath, file("KestrelK40.xml"), "Connector0/DIO3", out, err);
+        },
+        12);
     const struct {
         const char* offered;
         int answer;
@@ -181,43 +188,71 @@ void PlayProject(Transcript& script, const HostOptions& options, const std::stri
                 {0, {"created", "target \"K40\""}, {}}, [&](std::ostream& out, std::ostream& err) {
                     return RunProjectNew(options, project, {"K40=" + description}, true, out, err);
                 });
-    const auto addItem = [&](const AddItemRequest& item, const Expect& expect) {
+    const auto addItem = [&](const std::string& title, const AddItemRequest& item,
+                             const Expect& expect) {
         std::string command = "project add-item " + project + " --target " + item.target +
                               " --resource " + item.resource;
         if (!item.name.empty())
             command += " --name " + item.name;
-        script.Step("Add an item for " + item.resource, command, expect,
-                    [&](std::ostream& out, std::ostream& err) {
-                        return RunAddItem(options, project, item, out, err);
-                    });
+        script.Step(title, command, expect, [&](std::ostream& out, std::ostream& err) {
+            return RunAddItem(options, project, item, out, err);
+        });
     };
-    addItem({"K40", "Connector0/DIO3", "Valve"},
-            {0, {"Tangent I/O item \"Valve\"", "resource=/Connector0/DIO3"}, {}});
-    addItem({"K40", "AnalogInputs/AI2", "Sensors/Pressure"},
+    addItem(
+        "An item for a digital line: it binds to its resource", {"K40", "Connector1/DIO3", "Valve"},
+        {0,
+         {"Tangent I/O item \"Valve\"", "resource=/Connector1/DIO3", "tioResourceStatus: bound"},
+         {}});
+    addItem("An item in a folder, for an analog input",
+            {"K40", "AnalogInputs/AI2", "Sensors/Pressure"},
             {0,
              {"folder \"Sensors\"", "Tangent I/O item \"Pressure\"", "resource=/AnalogInputs/AI2"},
              {}});
-    addItem({"K40", "Connector0/DIO9", ""}, {1, {"has no resource \"Connector0/DIO9\""}, {}});
-    addItem({"K40", "Connector1/DIO0", "valve"}, {1, {"already has an item called"}, {}});
-    script.Step(
-        "Reopen the saved project and list its items", "project list " + project,
-        {0,
-         {"project \"demo\"", "Tangent I/O item \"Valve\"", "Tangent I/O item \"Pressure\""},
-         {"DIO0"}},
-        [&](std::ostream& out, std::ostream& err) {
-            return RunProjectList(options, project, out, err);
-        });
+    addItem(
+        "A second item on the line of \"Valve\": the first holds it, so this one is in conflict",
+        {"K40", "Connector1/DIO3", "Backup"},
+        {0, {"Tangent I/O item \"Backup\"", "tioResourceStatus: held by another item"}, {}});
+    addItem("A resource the board does not have", {"K40", "Connector0/DIO9", ""},
+            {1, {"has no resource \"Connector0/DIO9\""}, {}});
+    addItem("A name the target has already", {"K40", "Connector0/DIO0", "valve"},
+            {1, {"already has an item called"}, {}});
+}
+
+// Checks the JSON listing TEXT: each item of EXPECTED (path, status) is there with that status.
+// False, with what differs on ERR, otherwise.
+bool HoldsStatuses(const std::string& text,
+                   const std::vector<std::pair<std::string, int>>& expected, std::ostream& err) {
+    const auto listing = nlohmann::json::parse(text, nullptr, false);
+    if (listing.is_discarded()) {
+        err << "demo: the listing is not JSON\n";
+        return false;
+    }
+    std::map<std::string, nlohmann::json> items;
+    for (const auto& target : listing["targets"]) {
+        for (const auto& item : target["items"])
+            items[item["path"].get<std::string>()] = item;
+    }
+    bool all = true;
+    for (const auto& [path, status] : expected) {
+        const auto found = items.find(path);
+        if (found == items.end() || found->second["status"] != status) {
+            err << "demo: " << path << " should have status " << status << "\n";
+            all = false;
+        }
+    }
+    return all;
 }
 
 void PlayEdits(Transcript& script, const HostOptions& options, const WorkFolder& work) {
     const std::string project = work.File("demo.wbproj");
-    const std::string expansion = work.File("expansion.xml");
-    std::ofstream(expansion, std::ios::binary) << kExpansion;
+    const std::string analog = work.File("ai2.xml");
+    std::ofstream(analog, std::ios::binary) << kAnalogInput;
     const auto edit = [&](const std::string& title, const std::string& action,
                           const std::vector<std::string>& arguments, const Expect& expect) {
         std::string command = "edit " + project + " K40 " + action;
         for (const std::string& argument : arguments)
-            command += " " + argument;
+            command +=
+                " " + (argument.find(' ') == std::string::npos ? argument : "\"" + argument + "\"");
         script.Step(title, command, expect, [&](std::ostream& out, std::ostream& err) {
             EditRequest request{"K40", EditKind::Rename, "", "", ""};
             std::string error;
@@ -228,36 +263,47 @@ void PlayEdits(Transcript& script, const HostOptions& options, const WorkFolder&
             return RunEdit(options, project, request, out, err);
         });
     };
-    edit("Rename the line of \"Valve\"; the items follow or show their state", "rename",
-         {"Connector0/DIO3", "ValveLine"}, {0, {"renamed", "Tangent I/O item \"Valve\""}, {}});
-    edit("Remove the analog input of \"Pressure\"", "remove", {"AnalogInputs/AI2"},
-         {0, {"removed", "Tangent I/O item \"Pressure\""}, {}});
-    edit("Insert an expansion connector", "insert", {"/", expansion}, {0, {"inserted"}, {}});
+    edit("Rename the connector above \"Valve\" and \"Backup\": both follow it", "rename",
+         {"Connector1", "RearConnector"},
+         {0,
+          {"renamed /Connector1", "Valve: bound, resource \"/RearConnector/DIO3\"",
+           "Backup: conflict, resource \"/RearConnector/DIO3\""},
+          {"do not read back the same"}});
+    edit("Remove the analog input of \"Pressure\": its item says it is missing", "remove",
+         {"AnalogInputs/AI2"}, {0, {"removed", "Sensors/Pressure: missing"}, {}});
+    edit("Put the input back: the item was watching for it and binds again", "insert",
+         {"AnalogInputs", analog},
+         {0, {"inserted", "Sensors/Pressure: bound, resource \"/AnalogInputs/AI2\""}, {}});
+    const std::string read = "RearConnector/DIO3/MethodSet/Read";
+    edit("Change the signature of the line's Read method: the feature set counts once",
+         "set-attribute", {read, "Signature", "Boolean Read(U8 Port)"},
+         {0, {"Valve: bound, resource \"/RearConnector/DIO3\", feature set 1"}, {}});
+    edit("The same signature in other case is no change", "set-attribute",
+         {read, "Signature", "boolean read(u8 port)"},
+         {0, {"Valve: bound, resource \"/RearConnector/DIO3\", feature set 1"}, {}});
     edit("A node that is not there", "remove", {"AnalogInputs/AI9"}, {1, {"has no node"}, {}});
-    script.Step("Add an item for the inserted line",
-                "project add-item " + project + " --target K40 --resource Connector2/DIO0",
-                {0, {"Tangent I/O item \"DIO0\""}, {}}, [&](std::ostream& out, std::ostream& err) {
-                    return RunAddItem(options, project, {"K40", "Connector2/DIO0", ""}, out, err);
-                });
-    script.Step("Reopen and list again: the changed tree came back with the project",
-                "project list " + project,
-                {0, {"Tangent I/O item \"Valve\"", "Tangent I/O item \"DIO0\"", ".K40.xml"}, {}},
-                [&](std::ostream& out, std::ostream& err) {
-                    return RunProjectList(options, project, out, err);
-                });
-    const std::string kept = EditedDescriptionPath(project, u"K40");
     script.Step(
-        "The kept tree has the renamed, removed and inserted parts", "tree " + kept,
-        {0,
-         {"<DigitalLine name=\"ValveLine\">", "<Connector name=\"Connector2\">", "AI3"},
-         {"name=\"AI2\""}},
+        "Reopen the saved project: every item binds back to the same status",
+        "project list " + project + " --json", {0, {"\"featureSetVersion\": 1"}, {}},
         [&](std::ostream& out, std::ostream& err) {
-            return RunTree(options.modulePath, kept, "", out, err);
+            std::ostringstream listing;
+            const int exit = RunProjectJson(options, project, listing, err);
+            out << listing.str();
+            const bool same = HoldsStatuses(
+                listing.str(), {{"Valve", 0}, {"Backup", 2}, {"Sensors/Pressure", 0}}, err);
+            return exit != 0 || !same ? 1 : 0;
         },
-        4);
-    script.Step("The line's old name is gone from it", "tree " + kept + " Connector0/DIO3",
-                {1, {"no node"}, {}}, [&](std::ostream& out, std::ostream& err) {
-                    return RunTree(options.modulePath, kept, "Connector0/DIO3", out, err);
+        60);
+    const std::string kept = EditedDescriptionPath(project, u"K40");
+    script.Step("The kept tree: the method under the renamed connector, with the signature the "
+                "items saw last",
+                "tree " + kept + " " + read,
+                {0,
+                 {"<Signature>boolean read(u8 port)</Signature>",
+                  "<TIOLastSignature>Boolean Read(U8 Port)</TIOLastSignature>"},
+                 {}},
+                [&](std::ostream& out, std::ostream& err) {
+                    return RunTree(options.modulePath, kept, read, out, err);
                 });
 }
 
