@@ -9,7 +9,7 @@ file(MAKE_DIRECTORY ${SCRATCH})
 # The whole session, every step as it should be.
 run_wbhost(0 demo --examples ${EXAMPLES} --workdir ${SCRATCH}/demo)
 expect_all("${OUT}" "== 1. Load and check KestrelK40.xml" "tolerated difference"
-           "Tangent I/O item \"Valve\"" "renamed /Connector0/DIO3" "demo: all " " steps gave what they should")
+           "Tangent I/O item \"Valve\"" "renamed /Connector1" "Backup: conflict" "demo: all " " steps gave what they should")
 string(FIND "${OUT}" "NOT as expected" at)
 if(NOT at EQUAL -1)
   message(FATAL_ERROR "a demo step failed yet the demo exited 0:\n${OUT}")
