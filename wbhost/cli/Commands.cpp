@@ -25,6 +25,20 @@ using DumpFn = int32_t(const WBRefNum*, WBHandle, WBHandle, uint8_t*);
 using CompareFn = uint32_t(const char*, const char*);
 using InfoFn = int32_t();
 
+// The export NAME of MODULE; null, with the reason on ERR, when the module did not load or
+// does not export it.
+template <class Fn>
+Fn* FindExport(const HostedModule& module, const char* name, std::ostream& err) {
+    if (!module.Loaded()) {
+        err << "wbhost: " << module.Error() << "\n";
+        return nullptr;
+    }
+    Fn* const function = module.Find<Fn>(name);
+    if (function == nullptr)
+        err << "wbhost: the module does not export " << name << "\n";
+    return function;
+}
+
 // The problems TARGET's load recorded, one line each.
 std::vector<ProblemLine> ProblemsOf(const resources::Target& target, const std::string& file) {
     std::vector<ProblemLine> lines;
@@ -73,16 +87,10 @@ std::optional<std::string> ReadDescriptionForModule(const std::string& file, std
 
 int RunTree(const std::string& modulePath, const std::string& file, const std::string& path,
             std::ostream& out, std::ostream& err) {
-    HostedModule module(modulePath);
-    if (!module.Loaded()) {
-        err << "wbhost: " << module.Error() << "\n";
+    const HostedModule module(modulePath);
+    auto* const dump = FindExport<DumpFn>(module, "TIOResTree_Dump", err);
+    if (dump == nullptr)
         return kExitFailed;
-    }
-    auto* dump = module.Find<DumpFn>("TIOResTree_Dump");
-    if (dump == nullptr) {
-        err << "wbhost: the module does not export TIOResTree_Dump\n";
-        return kExitFailed;
-    }
     std::string error;
     resources::ResourceService service;
     resources::Target* const target =
@@ -148,16 +156,10 @@ int RunTreeCheck(const std::vector<std::string>& files, bool context, std::ostre
 
 int RunCompare(const std::string& modulePath, const std::string& required,
                const std::string& offered, std::ostream& out, std::ostream& err) {
-    HostedModule module(modulePath);
-    if (!module.Loaded()) {
-        err << "wbhost: " << module.Error() << "\n";
+    const HostedModule module(modulePath);
+    auto* const compare = FindExport<CompareFn>(module, "TIO_CompareTwoResourceTrees", err);
+    if (compare == nullptr)
         return kExitCannotRun;
-    }
-    auto* compare = module.Find<CompareFn>("TIO_CompareTwoResourceTrees");
-    if (compare == nullptr) {
-        err << "wbhost: the module does not export TIO_CompareTwoResourceTrees\n";
-        return kExitCannotRun;
-    }
     const auto first = ReadDescriptionForModule(required, err);
     const auto second = first ? ReadDescriptionForModule(offered, err) : std::nullopt;
     if (!first || !second)
@@ -178,16 +180,10 @@ int RunCompare(const std::string& modulePath, const std::string& required,
 int RunVersion(const std::string& version, const std::string& modulePath, std::ostream& out,
                std::ostream& err) {
     out << "wbhost " << version << "\n";
-    HostedModule module(modulePath);
-    if (!module.Loaded()) {
-        err << "wbhost: " << module.Error() << "\n";
+    const HostedModule module(modulePath);
+    auto* const info = FindExport<InfoFn>(module, "GetInfo", err);
+    if (info == nullptr)
         return kExitFailed;
-    }
-    auto* info = module.Find<InfoFn>("GetInfo");
-    if (info == nullptr) {
-        err << "wbhost: the module " << modulePath << " does not export GetInfo\n";
-        return kExitFailed;
-    }
     out << "module " << AbsolutePath(modulePath) << " (GetInfo " << info() << ")\n";
     return kExitOk;
 }
