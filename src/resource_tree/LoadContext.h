@@ -45,6 +45,7 @@ struct LoadContext {
     std::u16string language;
     int runningLoads = 0;
     size_t entriesMade = 0;
+    size_t textBytes = 0;
     ParseStack* innermost = nullptr;
     // Names compare without regard to case in the user's locale, which is not cheap; a document
     // repeats a handful of tags and attribute names, so each spelling is classified once.

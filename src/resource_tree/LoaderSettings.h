@@ -21,8 +21,13 @@ struct LoaderSettings {
     int maxElementDepth = 1000;
     // A "names" value yields at most this many names; the rest are dropped.
     size_t maxNames = 200000;
-    // Entries one load (with everything nested in it) may make, copies included.
-    size_t maxEntries = 16u * 1024u * 1024u;
+    // The budget of one load with everything nested in it (names lists, prototype and names
+    // copies, includes, deferred files, messages): entries made, and bytes of text held by what
+    // it makes (names, values, expanded names, messages) or read from files. Far above any real
+    // target description (tens of thousands of entries, a few MB), far below what would take the
+    // machine down: a document of a few KB that multiplies itself stops within seconds.
+    size_t maxEntries = 1000u * 1000u;
+    size_t maxTextBytes = 64u * 1024u * 1024u;
 };
 
 // The settings of loads started without settings of their own (including deferred loads that a

@@ -124,9 +124,17 @@ bool IsTrueWord(std::u16string_view text) noexcept {
     return false;
 }
 
-std::vector<ExpandedName> ExpandNames(std::u16string_view value, size_t limit, bool& truncated) {
+std::vector<ExpandedName> ExpandNames(std::u16string_view value, size_t limit, bool& truncated,
+                                      size_t maxUnits) {
     truncated = false;
     std::vector<ExpandedName> names;
+    size_t units = 0;
+    // A few bytes of "names" can ask for many long names; what is made is counted as it grows.
+    const auto add = [&](ExpandedName&& made) {
+        units += made.name.size() + made.variable.size();
+        names.push_back(std::move(made));
+        return units <= maxUnits;
+    };
     for (const std::u16string& piece : SplitListText(value, u',', true)) {
         Range range;
         if (!ParseRange(piece, range)) {
@@ -134,7 +142,8 @@ std::vector<ExpandedName> ExpandNames(std::u16string_view value, size_t limit, b
                 truncated = true;
                 break;
             }
-            names.push_back({piece, {}, 0});
+            if (!add({piece, {}, 0}))
+                return names;
             continue;
         }
         for (uint64_t i = range.first; i <= range.last; ++i) {
@@ -145,12 +154,20 @@ std::vector<ExpandedName> ExpandNames(std::u16string_view value, size_t limit, b
             std::u16string name(range.prefix);
             name += DecimalText(i);
             name += range.suffix;
-            names.push_back({std::move(name), std::u16string(range.variable), i});
+            if (!add({std::move(name), std::u16string(range.variable), i}))
+                return names;
             if (i == UINT64_MAX)
                 break;
         }
     }
     return names;
+}
+
+size_t TextUnits(const std::vector<ExpandedName>& names) noexcept {
+    size_t units = 0;
+    for (const ExpandedName& name : names)
+        units += name.name.size() + name.variable.size();
+    return units;
 }
 
 bool SubstituteVariables(std::u16string& text, const VariableMap& variables) {

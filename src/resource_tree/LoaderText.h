@@ -24,8 +24,12 @@ struct ExpandedName {
 
 // Expands a "names" value: pieces split at "," with trimming; a piece prefix[var=first..last]suffix
 // gives prefix+i+suffix for i from first to last. At most LIMIT names are made; TRUNCATED tells
-// whether more were asked for.
-std::vector<ExpandedName> ExpandNames(std::u16string_view value, size_t limit, bool& truncated);
+// whether more were asked for. Making stops, without TRUNCATED, once the names and variables made
+// hold more than MAXUNITS units: the caller, which counts them, then refuses the whole list.
+std::vector<ExpandedName> ExpandNames(std::u16string_view value, size_t limit, bool& truncated,
+                                      size_t maxUnits = SIZE_MAX);
+// The units of text that NAMES hold (names and variables).
+size_t TextUnits(const std::vector<ExpandedName>& names) noexcept;
 
 // Variables by name, ignoring case.
 using VariableMap = std::map<std::u16string, std::u16string, qv::kern::LessNoCase>;

@@ -1,6 +1,7 @@
 // The resource-tree builder: what a pending element becomes (node, text, link, include, capture).
 #include "kern/Utf8.h"
 #include "kern/osdep/OSException.h"
+#include "resource_tree/ConfinedPath.h"
 #include "resource_tree/ListText.h"
 #include "resource_tree/ParseStack.h"
 
@@ -26,6 +27,7 @@ void ParseStack::Capture(Frame& frame) {
         tag += u'"';
     }
     tag += u'>';
+    CountText(tag.size());
     frame.node->AppendTextAt(frame.position, tag);
     frame.hasPending = false;
     frame.pendingName.clear();
@@ -48,7 +50,11 @@ ParseStack::Frame* ParseStack::ProcessPending(Frame& frame, bool container) {
     bool isNode = false;
     if (steering.names != nullptr) {
         bool truncated = false;
-        frame.pendingNames = ExpandNames(*steering.names, context_.settings.maxNames, truncated);
+        const size_t spent = context_.textBytes / sizeof(char16_t);
+        const size_t budget = context_.settings.maxTextBytes / sizeof(char16_t);
+        frame.pendingNames = ExpandNames(*steering.names, context_.settings.maxNames, truncated,
+                                         budget > spent ? budget - spent : 0);
+        CountText(TextUnits(frame.pendingNames));
         if (truncated) {
             AddError(node, u"The names list yields more than " +
                                DecimalText(context_.settings.maxNames) +
@@ -98,7 +104,7 @@ ParseStack::Frame* ParseStack::ProcessNode(Frame& frame, bool container, const s
     if (Equals(steering.type, u"xml")) {
         ResTreePosition at = node.IsOrdered() ? node.End() : node.Find(name);
         if (at == node.End()) {
-            CountEntry(node);
+            CountEntry(name.size());
             at = node.AddText(InsertPosition(node, steering), name, WString()).position;
         }
         frame.capturing = true;
@@ -138,7 +144,7 @@ ParseStack::Frame* ParseStack::ProcessNode(Frame& frame, bool container, const s
     }
     const bool hadPrototype = prototype != nullptr;
     MergeOrReplace(node, name, tagName, ordered, overwrite, &prototype);
-    CountEntry(node);
+    CountEntry(name.size() + tagName.size());
     const auto made = node.AddChild(InsertPosition(node, steering), name, tagName, ordered);
     if (hadPrototype && prototype == nullptr)
         AddError(node, u"Unable to find prototype node: " + *steering.prototype);
@@ -196,7 +202,7 @@ void ParseStack::ProcessText(Frame& frame, const std::u16string& name, const Ste
         text = LocalizeText(text, context_.language);
         kind = EntryKind::LocalizedText;
     }
-    CountEntry(node);
+    CountEntry(name.size() + text.size());
     node.AddOrSetText(InsertPosition(node, steering), WString(name), WString(std::move(text)), kind,
                       frame.overwrite);
 }
@@ -225,7 +231,7 @@ void ParseStack::ProcessLink(Frame& frame, const std::u16string& name, const std
                              const Steering& steering) {
     ResTreeNode& node = *frame.node;
     ResTreeNode* target = node.ResolvePath(path, OuterDocumentRoot());
-    CountEntry(node);
+    CountEntry(name.size() + path.size());
     if (target == nullptr) {
         node.AddText(InsertPosition(node, steering), name, u"UNRESOLVED LINK: " + path);
         return;
@@ -243,17 +249,23 @@ void ParseStack::ProcessInclude(Frame& frame, const std::u16string& path,
     const std::string& directory = context_.settings.includeDirectory.empty()
                                        ? HostDirectory()
                                        : context_.settings.includeDirectory;
-    const std::string file = JoinFilePath(directory, qv::kern::WideToStandardUtf8(path));
+    const ConfinedFile file = ResolveConfined(directory, qv::kern::WideToStandardUtf8(path));
+    if (!file.refusal.empty()) {
+        AddError(node, file.refusal);
+        return;
+    }
     const bool asChild = !Equals(steering.what, u"children");
     ParseStack* const outer = context_.innermost;
     try {
         ResTreeNode* included = nullptr;
-        node.ParseFile(file, asChild, &included);
+        if (!file.path.empty())
+            node.ParseFile(file.path, asChild, &included);
         context_.innermost = outer;
         if (included != nullptr)
             SubstituteInSubtree(*included, ContextVariables(), 0);
         else
-            AddError(node, u"Unable to find include file node: " + FromUtf8Lenient(file));
+            AddError(node, u"Unable to find include file node: " +
+                               FromUtf8Lenient(JoinFilePath(directory, qv::kern::WideToStandardUtf8(path))));
     } catch (const qv::kern::osdep::OSException&) {
         context_.innermost = outer;
         AddError(node, u"Encountered an OS exception.");

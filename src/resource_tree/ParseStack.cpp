@@ -50,8 +50,8 @@ ResTreeNode* ParseStack::DocumentRoot() const noexcept {
 
 ParseStack::Frame& ParseStack::Push(ResTreeNode& node, const Frame& enclosing, bool overwrite) {
     if (NodeDepth(node) > static_cast<size_t>(context_.settings.maxElementDepth)) {
-        Abort(*enclosing.node, u"Elements are nested deeper than " +
-                                   DecimalText(context_.settings.maxElementDepth) + u" levels.");
+        Abort(u"Elements are nested deeper than " + DecimalText(context_.settings.maxElementDepth) +
+              u" levels.");
     }
     if (frames_.size() == depth_)
         frames_.push_back(std::make_unique<Frame>());
@@ -129,6 +129,7 @@ void ParseStack::EndElementUtf8(const char* name) {
             std::u16string closing = u"</";
             AppendUtf8AsUtf16(name, closing);
             closing += u">";
+            CountText(closing.size());
             frame.node->AppendTextAt(frame.position, closing);
             --frame.captureDepth;
         } else {
@@ -192,20 +193,42 @@ ParseStack::Steering ParseStack::ReadSteering(const XmlAttributes& attributes) {
     return steering;
 }
 
-void ParseStack::CountEntry(ResTreeNode& node) {
-    if (++context_.entriesMade <= context_.settings.maxEntries)
-        return;
-    Abort(node, u"The load was stopped: it would make more than " +
-                    DecimalText(context_.settings.maxEntries) + u" entries.");
+void ParseStack::CountEntry(size_t textUnits) {
+    Spend(1, textUnits * sizeof(char16_t));
 }
 
-void ParseStack::Abort(ResTreeNode& /*at*/, std::u16string_view message) {
-    // A stopped load is the load's problem: the message goes where syntax errors go.
-    AddError(*frames_[0]->node, message);
+void ParseStack::CountText(size_t textUnits) {
+    Spend(0, textUnits * sizeof(char16_t));
+}
+
+void ParseStack::CountInput(size_t bytes) {
+    Spend(0, bytes);
+}
+
+void ParseStack::Spend(size_t entries, size_t bytes) {
+    const LoaderSettings& limits = context_.settings;
+    context_.entriesMade += entries;
+    context_.textBytes += bytes;
+    if (context_.entriesMade > limits.maxEntries) {
+        Abort(u"The load was stopped: it would make more than " + DecimalText(limits.maxEntries) +
+              u" entries.");
+    }
+    if (context_.textBytes > limits.maxTextBytes) {
+        Abort(u"The load was stopped: it would hold more than " + DecimalText(limits.maxTextBytes) +
+              u" bytes of text.");
+    }
+}
+
+void ParseStack::Abort(std::u16string_view message) {
+    // A stopped load is the load's problem: the message goes where syntax errors go. It is not
+    // charged: the budget is spent already.
+    AppendError(*frames_[0]->node, message);
     throw LoadAborted{};
 }
 
 std::u16string ParseStack::InputAroundPosition() {
+    if (hideInput_ && DocumentRoot() == nullptr)
+        return {};
     int offset = 0;
     const std::string_view held = InputContext(offset);
     if (held.empty())
@@ -233,6 +256,10 @@ std::u16string ParseStack::InputAroundPosition() {
 }
 
 void ParseStack::AddError(ResTreeNode& node, std::u16string_view message) {
+    context_.textBytes += AppendError(node, message) * sizeof(char16_t);
+}
+
+size_t ParseStack::AppendError(ResTreeNode& node, std::u16string_view message) {
     std::u16string text = u"Error on line " + DecimalText(CurrentLine()) + u" at column " +
                           DecimalText(CurrentColumn());
     if (!filePath_.empty())
@@ -242,12 +269,13 @@ void ParseStack::AddError(ResTreeNode& node, std::u16string_view message) {
     text += u"\n   ";
     text += InputAroundPosition();
     text += u"\n";
+    const size_t units = text.size();
     const ResTreePosition found = node.Find(kParseErrors);
-    if (found != node.End() && IsTextKind(found->Kind())) {
+    if (found != node.End() && IsTextKind(found->Kind()))
         node.AppendTextAt(found, text);
-        return;
-    }
-    node.AddText(node.End(), WString(std::u16string(kParseErrors)), WString(std::move(text)));
+    else
+        node.AddText(node.End(), WString(std::u16string(kParseErrors)), WString(std::move(text)));
+    return units;
 }
 
 } // namespace wbhw

@@ -24,7 +24,13 @@ public:
     // The node the document element became (null until then).
     ResTreeNode* DocumentRoot() const noexcept;
     // Appends MESSAGE to NODE's "XMLParseErrors" with the parser's line, column and context.
+    // The message is charged to the load's text budget; the next entry made checks it.
     void AddError(ResTreeNode& node, std::u16string_view message);
+    // Charges BYTES read from a file to the load's text budget; past it the load stops.
+    void CountInput(size_t bytes);
+    // Leaves the input out of messages: a file that is not yet known to be a description (an
+    // include or deferred file) must not have its lines copied into a message.
+    void HideInputUntilDocument() noexcept { hideInput_ = true; }
 
 protected:
     // Names, attributes and texts go from Expat's UTF-8 straight into the frame that keeps them;
@@ -104,9 +110,15 @@ private:
     void SubstituteInSubtree(ResTreeNode& node, const VariableMap& variables, int depth);
     VariableMap ContextVariables() const;
 
-    // Counts one entry made; past the limit the load stops with a message in NODE.
-    void CountEntry(ResTreeNode& node);
-    [[noreturn]] void Abort(ResTreeNode& node, std::u16string_view message);
+    // Counts one entry made holding TEXTUNITS units of text (name, type, value); past the
+    // load's budget the load stops with a message.
+    void CountEntry(size_t textUnits);
+    // Counts TEXTUNITS units of text made without a new entry (captures, substitutions).
+    void CountText(size_t textUnits);
+    void Spend(size_t entries, size_t bytes);
+    [[noreturn]] void Abort(std::u16string_view message);
+    // Writes the message; answers the units written.
+    size_t AppendError(ResTreeNode& node, std::u16string_view message);
     std::u16string InputAroundPosition();
 
     LoadContext& context_;
@@ -114,6 +126,7 @@ private:
     // Frames are reused from one element to the next so that their buffers keep their capacity.
     std::vector<std::unique_ptr<Frame>> frames_;
     size_t depth_ = 0;
+    bool hideInput_ = false;
 };
 
 // True when ANCESTOR is NODE or one of NODE's ancestors.

@@ -1,5 +1,6 @@
 // Loading resource-tree documents into nodes: whole texts, files in blocks, deferred files.
 #include "kern/Utf8.h"
+#include "resource_tree/ConfinedPath.h"
 #include "resource_tree/ListText.h"
 #include "resource_tree/ParseStack.h"
 
@@ -95,14 +96,30 @@ int32_t RunLoad(ResTreeNode& node, LoadScope& scope, bool asChild, ResTreeNode**
     return kOk;
 }
 
+// A refused file is reported where the load that asked for it writes its messages, or, for a
+// deferred load that a lookup started, in the node itself.
+void ReportRefusal(ResTreeNode& node, LoadScope& scope, std::u16string_view message) {
+    if (ParseStack* outer = scope.Context().innermost) {
+        outer->AddError(node, message);
+        return;
+    }
+    std::u16string text = u"Error: ";
+    text += message;
+    text += u"\n";
+    const ResTreeNode::Position found = node.Find(u"XMLParseErrors");
+    if (found != node.End() && IsTextKind(found->Kind()))
+        node.AppendTextAt(found, text);
+    else
+        node.AddText(node.End(), u"XMLParseErrors", text);
+}
+
 // A load nested too deeply is refused with a message at the place that asked for it.
 int32_t RefuseTooDeep(ResTreeNode& node, LoadScope& scope, std::u16string_view what) {
     std::u16string message = u"Loads are nested deeper than " +
                              DecimalText(scope.Context().settings.maxNestedLoads) +
                              u" levels; not loaded: ";
     message += what;
-    if (ParseStack* outer = scope.Context().innermost)
-        outer->AddError(node, message);
+    ReportRefusal(node, scope, message);
     return kFail;
 }
 
@@ -136,11 +153,18 @@ int32_t ResTreeNode::ParseFile(const std::string& path, bool asChild, ResTreeNod
     struct stat info {};
     if (file.get() < 0 || fstat(file.get(), &info) != 0 || !S_ISREG(info.st_mode))
         return kFail;
-    return RunLoad(*this, scope, asChild, out, FromUtf8Lenient(path), [&file](ParseStack& stack) {
+    // A file that a description named is not the caller's own text: its bytes count against the
+    // load's budget, and its lines stay out of messages until it has shown itself a description.
+    const bool nested = !scope.IsOutermost();
+    return RunLoad(*this, scope, asChild, out, FromUtf8Lenient(path), [&](ParseStack& stack) {
+        if (nested)
+            stack.HideInputUntilDocument();
         std::vector<char> block(kBlockSize);
         uint64_t fed = 0;
         for (;;) {
             const size_t n = ReadBlock(file.get(), block.data(), block.size());
+            if (nested)
+                stack.CountInput(n);
             const bool last = n < block.size();
             if (!stack.Parse(std::string_view(block.data(), n), last))
                 return false;
@@ -175,8 +199,14 @@ int32_t ResTreeNode::LoadDeferred() {
                 parent_->LoadDeferred();
             continue;
         }
-        const int32_t result =
-            ParseFile(JoinFilePath(directory, qv::kern::WideToStandardUtf8(piece)), false);
+        const ConfinedFile file = ResolveConfined(directory, qv::kern::WideToStandardUtf8(piece));
+        if (!file.refusal.empty()) {
+            ReportRefusal(*this, scope, file.refusal);
+            return kFail;
+        }
+        if (file.path.empty())
+            return kFail;
+        const int32_t result = ParseFile(file.path, false);
         if (result != kOk)
             return result;
     }

@@ -82,10 +82,11 @@ ResTreeNode::Position ResTreeNode::Find(std::u16string_view name) const noexcept
         if (!index_) {
             index_ = std::make_unique<NameIndex>();
             for (auto it = list_.begin(); it != list_.end(); ++it)
-                index_->emplace(std::u16string_view(it->name_), it);
+                ++index_->try_emplace(std::u16string_view(it->name_), IndexedName{it, 0})
+                      .first->second.count;
         }
         const auto found = index_->find(name);
-        return found == index_->end() ? End() : Position(found->second);
+        return found == index_->end() ? End() : Position(found->second.first);
     }
     for (auto it = list_.begin(); it != list_.end(); ++it) {
         if (qv::kern::EqualsNoCase(it->Name(), name))
@@ -231,14 +232,19 @@ bool ResTreeNode::SetTextKindAt(Position position, EntryKind kind) {
 }
 
 void ResTreeNode::IndexInserted(EntryList::iterator entry, bool atEnd) {
-    const auto [at, isNew] = index_->emplace(std::u16string_view(entry->name_), entry);
-    if (isNew || atEnd)
+    const auto [at, isNew] = index_->emplace(std::u16string_view(entry->name_), IndexedName{entry});
+    if (isNew)
+        return;
+    ++at->second.count;
+    if (atEnd)
         return;
     // Inserted before some entry: it is the first of its name if the old first follows it.
     for (auto it = std::next(entry); it != list_.end(); ++it) {
-        if (it == at->second) {
+        if (it == at->second.first) {
+            // The key views the first entry's name, so it is replaced along with it.
+            const size_t count = at->second.count;
             index_->erase(at);
-            index_->emplace(std::u16string_view(entry->name_), entry);
+            index_->emplace(std::u16string_view(entry->name_), IndexedName{entry, count});
             return;
         }
     }
@@ -246,12 +252,19 @@ void ResTreeNode::IndexInserted(EntryList::iterator entry, bool atEnd) {
 
 void ResTreeNode::IndexErasing(EntryList::iterator entry) {
     const auto at = index_->find(std::u16string_view(entry->name_));
-    if (at == index_->end() || at->second != entry)
+    if (at == index_->end())
         return;
+    const size_t left = at->second.count - 1;
+    if (at->second.first != entry) {
+        at->second.count = left;
+        return;
+    }
     index_->erase(at);
+    if (left == 0)
+        return;
     for (auto it = std::next(entry); it != list_.end(); ++it) {
         if (qv::kern::EqualsNoCase(it->name_, entry->name_)) {
-            index_->emplace(std::u16string_view(it->name_), it);
+            index_->emplace(std::u16string_view(it->name_), IndexedName{it, left});
             return;
         }
     }

@@ -272,9 +272,15 @@ private:
     void RaiseValueChanged(const ResTreeEntry& entry);
     void IndexInserted(EntryList::iterator entry, bool atEnd);
     void IndexErasing(EntryList::iterator entry);
-    // The first entry of each name in a large ordered node; without it every lookup, and so
-    // every element loaded into a long list, scans the list.
-    using NameIndex = std::map<std::u16string_view, EntryList::iterator, qv::kern::LessNoCase>;
+    // The first entry of each name in a large ordered node, and how many entries have the name;
+    // without it every lookup, and so every element loaded into a long list, scans the list.
+    // The count spares the scan for the next entry of a name when its only entry goes (a list
+    // that replaces every name of an earlier one would otherwise scan the list per name).
+    struct IndexedName {
+        EntryList::iterator first;
+        size_t count = 1;
+    };
+    using NameIndex = std::map<std::u16string_view, IndexedName, qv::kern::LessNoCase>;
 
     WString name_;
     WString type_;

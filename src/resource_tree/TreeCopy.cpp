@@ -31,7 +31,7 @@ void ParseStack::CopyEntries(ResTreeNode& source, ResTreeNode& destination, bool
     for (ResTreePosition at = source.Begin(); at != source.End(); ++at) {
         const EntryKind kind = at->Kind();
         if (IsTextKind(kind)) {
-            CountEntry(destination);
+            CountEntry(at->Name().size() + at->Text()->size());
             const auto added =
                 destination.AddText(destination.End(), at->Name(), *at->Text(), kind);
             if (!added.inserted && overwrite)
@@ -40,7 +40,7 @@ void ParseStack::CopyEntries(ResTreeNode& source, ResTreeNode& destination, bool
             ResTreeNode& from = *at->Child();
             MergeOrReplace(destination, at->Name(), from.Type(), from.IsOrdered(), overwrite,
                            nullptr);
-            CountEntry(destination);
+            CountEntry(at->Name().size() + from.Type().size());
             const auto made =
                 destination.AddChild(destination.End(), at->Name(), from.Type(), from.IsOrdered());
             if (made.node != nullptr && !IsAncestorOrSelf(&from, made.node) &&
@@ -49,7 +49,7 @@ void ParseStack::CopyEntries(ResTreeNode& source, ResTreeNode& destination, bool
         } else if (kind == EntryKind::Link) {
             // The copy points at the node the original points at.
             const std::u16string target = JoinResourcePath(source.Path(), *at->Text());
-            CountEntry(destination);
+            CountEntry(at->Name().size() + target.size());
             destination.AddLink(destination.End(), at->Name(),
                                 RelativeResourcePath(destination.Path(), target));
         }
@@ -78,7 +78,7 @@ void ParseStack::MakeNameCopies(Frame& frame) {
             at = previous;
             ++at;
         }
-        CountEntry(node);
+        CountEntry(copy.name.size() + model->Type().size());
         const auto made = node.AddChild(at, copy.name, model->Type(), model->IsOrdered());
         if (made.node == nullptr || IsAncestorOrSelf(model, made.node)) {
             AddError(node, u"Unable to copy the node for the name: " + copy.name);
@@ -113,8 +113,10 @@ void ParseStack::SubstituteInSubtree(ResTreeNode& node, const VariableMap& varia
         if (!IsTextKind(at->Kind()) || at->Text()->find(u"#{") == std::u16string::npos)
             continue;
         std::u16string text = *at->Text();
-        if (SubstituteVariables(text, variables))
+        if (SubstituteVariables(text, variables)) {
+            CountText(text.size());
             node.SetTextAt(at, std::move(text));
+        }
     }
     // Loading deferred content below may change this node's entries; the children are held in
     // use so that none of them is deleted before its turn.

@@ -3,6 +3,7 @@
 #include "resource_tree/LoaderText.h"
 #include "resource_tree/ResTreeNode.h"
 
+#include <filesystem>
 #include <gtest/gtest.h>
 
 namespace wbhw {
@@ -122,6 +123,41 @@ TEST(ResTreeLoader, DeferredFilesLoadOnTheFirstMissOnce) {
     EXPECT_EQ(m->Find(u":DeferredLoadPath"), m->End());
     EXPECT_EQ(root->Find(u":DeferredLoadPath"), root->End());
     EXPECT_EQ(m->LoadDeferred(), 0);
+}
+
+TEST(ResTreeLoader, FilesOutsideTheirDirectoryAreRefusedAndNeverQuoted) {
+    ScratchDirectory dir;
+    std::filesystem::create_directory(dir.path() + "/descriptions");
+    std::filesystem::create_directory(dir.path() + "/private");
+    const std::string secret = dir.Write("private/secret.xml", "root:x:0:0:SECRET\nmore\n");
+    dir.Write("descriptions/notes.txt", "token=SECRET\n");
+    dir.Write("descriptions/ok.xml", "<Module name='ok'/>");
+    std::filesystem::create_directory_symlink(dir.path() + "/private",
+                                              dir.path() + "/descriptions/out");
+    std::filesystem::create_symlink(secret, dir.path() + "/descriptions/leak.xml");
+    LoaderSettings settings;
+    settings.includeDirectory = dir.path() + "/descriptions";
+    settings.deferredDirectory = settings.includeDirectory;
+    const std::u16string outside = u"The file lies outside the directory ";
+    const std::u16string absolute = u"Absolute paths are not read";
+    auto root = Load(u"<Top><:Include>" + FromUtf8Lenient(secret) +
+                         u"</:Include><:Include>../private/secret.xml</:Include>"
+                         u"<:Include>out/secret.xml</:Include><:Include>leak.xml</:Include>"
+                         u"<:Include>notes.txt</:Include><:Include>ok.xml</:Include>"
+                         u"<Group name='g'><:DeferredLoadPath>../private/secret.xml"
+                         u"</:DeferredLoadPath></Group><:Link name='l'>g/Any</:Link></Top>",
+                     &settings);
+    EXPECT_NE(ChildOf(*root, u"ok"), nullptr);
+    const std::u16string errors =
+        TextOf(*root, u"XMLParseErrors") + TextOf(*ChildOf(*root, u"g"), u"XMLParseErrors");
+    EXPECT_EQ(errors.find(u"SECRET"), std::u16string::npos);
+    EXPECT_NE(errors.find(absolute), std::u16string::npos);
+    size_t refused = 0;
+    for (size_t at = errors.find(outside); at != std::u16string::npos;
+         at = errors.find(outside, at + 1))
+        ++refused;
+    EXPECT_EQ(refused, 4u); // "..", a folder link, a file link, the deferred ".."
+    EXPECT_NE(errors.find(u"notes.txt"), std::u16string::npos);
 }
 
 TEST(ResTreeLoader, LookupsOutsideALoadUseTheDefaultSettings) {

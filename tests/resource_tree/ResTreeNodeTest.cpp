@@ -63,16 +63,21 @@ TEST(ResTreeNode, LargeOrderedNodesFindTheFirstOfEachNameAsAScanWould) {
     };
     uint32_t state = 7;
     auto next = [&state] { return state = state * 1103515245u + 12345u; };
-    for (int round = 0; round < 400; ++round) {
+    for (int round = 0; round < 1000; ++round) {
         const std::u16string name = spellings[next() % spellings.size()] +
                                     std::u16string(1, static_cast<char16_t>(u'0' + next() % 8));
-        const uint32_t action = next() % 4;
-        if (action == 0 && !node.IsEmpty()) {
-            // Insert before some existing entry.
-            ResTreePosition at = node.Begin();
+        const uint32_t action = next() % 5;
+        ResTreePosition at = node.Begin();
+        if (!node.IsEmpty()) {
             for (uint32_t steps = next() % node.EntryCount(); steps > 0; --steps)
                 ++at;
+        }
+        if (action == 0 && !node.IsEmpty()) {
+            // Insert before some existing entry.
             node.AddText(at, name, u"");
+        } else if (action == 4 && !node.IsEmpty()) {
+            // Remove any entry, the first of its name or a later one.
+            node.RemoveAt(at);
         } else if (action == 1) {
             node.RemoveByName(name);
         } else {
@@ -80,6 +85,10 @@ TEST(ResTreeNode, LargeOrderedNodesFindTheFirstOfEachNameAsAScanWould) {
         }
         for (const std::u16string& probe : {name, std::u16string(u"A3"), std::u16string(u"c7")})
             ASSERT_TRUE(node.Find(probe) == firstByScan(probe)) << round;
+        for (char16_t digit = u'0'; digit < u'8'; ++digit) {
+            const std::u16string probe = std::u16string(u"b") + digit;
+            ASSERT_TRUE(node.Find(probe) == firstByScan(probe)) << round;
+        }
     }
     EXPECT_GT(node.EntryCount(), 30u);
 }
