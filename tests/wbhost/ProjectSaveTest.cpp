@@ -70,11 +70,12 @@ TEST(ProjectSave, AnInterruptedSaveLeavesThePreviousFileIntact) {
     // The abandoned temporary file sits beside it, complete; it never shadows the project.
     EXPECT_EQ(FilesIn(scratch.Path()).size(), 2u);
 
+    const std::vector<std::string> withLeftover = FilesIn(scratch.Path());
     SetMark(project, u"second");
     ASSERT_TRUE(project.Save(path, &error)) << error;
     EXPECT_EQ(MarkOf(path, service), u"second");
-    // The next save wrote through the abandoned file and renamed it: nothing is left over.
-    EXPECT_EQ(FilesIn(scratch.Path()), std::vector<std::string>{"p.wbproj"});
+    // The next save wrote a file of its own; the leftover is neither read nor renamed.
+    EXPECT_EQ(FilesIn(scratch.Path()), withLeftover);
 }
 
 TEST(ProjectSave, FailuresAreReportedAndKeepTheFileMode) {
@@ -95,41 +96,34 @@ TEST(ProjectSave, FailuresAreReportedAndKeepTheFileMode) {
     EXPECT_EQ(info.st_mode & 0777, 0640u); // a save does not make the file private
 }
 
-TEST(ProjectSave, LeftoversOfEarlierSavesAreReplacedAndFailedSavesLeaveNone) {
+TEST(ProjectSave, LinksAreSavedThroughAndFailedSavesLeaveNothing) {
     ScratchFolder scratch;
     wbhost::resources::ResourceService service;
     Project project(service);
-    const std::string path = scratch.File("p.wbproj");
-    const std::string temporary = wbhost::project::TemporaryFileFor(path);
     std::string error;
+    std::filesystem::create_directories(scratch.File("real"));
+    const std::string real = scratch.File("real/p.wbproj");
     SetMark(project, u"first");
-    ASSERT_TRUE(project.Save(path, &error)) << error;
+    ASSERT_TRUE(project.Save(real, &error)) << error;
 
-    // A killed save left a longer, read-only file; it never shadows the project, and the next
-    // save writes a fresh one instead of appending to it or failing on it.
-    scratch.Write("p.wbproj.tmp", std::string(100000, 'x'));
-    ::chmod(temporary.c_str(), 0400);
-    EXPECT_EQ(MarkOf(path, service), u"first");
-    SetMark(project, u"second");
-    ASSERT_TRUE(project.Save(path, &error)) << error;
-    EXPECT_EQ(MarkOf(path, service), u"second");
-    EXPECT_EQ(FilesIn(scratch.Path()), std::vector<std::string>{"p.wbproj"});
-
-    // A link planted under the temporary name is removed, not written through.
-    const std::string victim = scratch.Write("victim", "keep");
-    ASSERT_EQ(::symlink(victim.c_str(), temporary.c_str()), 0);
-    ASSERT_TRUE(project.Save(path, &error)) << error;
-    std::string kept;
-    ASSERT_TRUE(wbhost::project::ReadWholeFile(victim, kept, nullptr));
-    EXPECT_EQ(kept, "keep");
-    EXPECT_FALSE(std::filesystem::is_symlink(path));
+    // A project reached through a link: the link stays a link and its file gets the change.
+    const std::string link = scratch.File("p.wbproj");
+    ASSERT_EQ(::symlink("real/p.wbproj", link.c_str()), 0);
+    auto opened = Project::Open(link, service, &error);
+    ASSERT_TRUE(opened) << error;
+    SetMark(*opened, u"through the link");
+    ASSERT_TRUE(opened->Save(link, &error)) << error;
+    EXPECT_TRUE(std::filesystem::is_symlink(link));
+    EXPECT_EQ(FilesIn(scratch.File("real")), std::vector<std::string>{"p.wbproj"});
+    opened.reset();
+    EXPECT_EQ(MarkOf(real, service), u"through the link");
 
     // The rename fails (a folder with contents is in the way): the temporary file goes too.
     const std::string blocked = scratch.File("blocked");
     std::filesystem::create_directories(blocked + "/inside");
     EXPECT_FALSE(project.Save(blocked, &error));
     EXPECT_NE(error.find("blocked"), std::string::npos) << error;
-    EXPECT_FALSE(std::filesystem::exists(wbhost::project::TemporaryFileFor(blocked)));
+    EXPECT_EQ(FilesIn(scratch.Path()), (std::vector<std::string>{"blocked", "p.wbproj", "real"}));
 }
 
 } // namespace

@@ -238,7 +238,14 @@ void Project::DetachProviders() {
 }
 
 bool Project::Save(const std::string& path, std::string* error,
-                   const std::function<bool()>& beforeRename) const {
+                   const std::function<bool()>& beforeRename) {
+    // Another file (a new project's, or a copy's) is locked before anything else: replacing it
+    // in the middle of another process's change would lose that change.
+    ProjectLock other;
+    const bool held = !lock_.Path().empty() && lock_.Path() == path;
+    if (!held && !other.Acquire(path, error))
+        return false;
+    ProjectLock& lock = held ? lock_ : other;
     // Providers write their items' last state into the properties now, so the snapshot is taken
     // only after every one of them agreed.
     for (const auto& provider : providers_) {
@@ -248,8 +255,10 @@ bool Project::Save(const std::string& path, std::string* error,
             return false;
         }
     }
-    if (!WriteFileAtomically(path, FormatProject(Snapshot()), error, beforeRename))
+    if (!WriteFileAtomically(path, FormatProject(Snapshot()), error, beforeRename, &lock))
         return false;
+    if (!held)
+        lock_ = std::move(other);
     // The file is in place whatever a provider answers now.
     for (const auto& provider : providers_)
         provider->ProjectSaved();
@@ -258,6 +267,9 @@ bool Project::Save(const std::string& path, std::string* error,
 
 std::unique_ptr<Project> Project::Open(const std::string& path, resources::ResourceService& service,
                                        std::string* error, ObjectFactory factory) {
+    ProjectLock lock;
+    if (!lock.Acquire(path, error))
+        return nullptr;
     std::string text;
     if (!ReadWholeFile(path, text, error))
         return nullptr;
@@ -273,6 +285,7 @@ std::unique_ptr<Project> Project::Open(const std::string& path, resources::Resou
         SetError(error, path + ": " + message);
         return nullptr;
     }
+    project->lock_ = std::move(lock);
     return project;
 }
 

@@ -7,6 +7,7 @@
 #include "host/contracts/IwbProjectProvider.h"
 #include "project/ProjectFormat.h"
 #include "project/ProjectItem.h"
+#include "project/ProjectLock.h"
 #include "project/TargetObject.h"
 #include "resources/ResourceService.h"
 
@@ -89,14 +90,19 @@ public:
     // Writes the project to PATH atomically (see WriteFileAtomically): every attached provider
     // hears ProjectSaving first (a failure stops the save before anything is written and says
     // which status) and, once the file is in place, ProjectSaved. False with a message in ERROR
-    // (may be null) when it could not. BEFORERENAME as there.
+    // (may be null) when it could not. BEFORERENAME as there. The project keeps its file locked
+    // from then on (see ProjectLock); a file it does not hold yet is locked first, waiting for
+    // another process's change to it to finish.
     bool Save(const std::string& path, std::string* error,
-              const std::function<bool()>& beforeRename = {}) const;
+              const std::function<bool()>& beforeRename = {});
     // Reads the project file PATH into a new project whose targets load through SERVICE and
     // whose other objects FACTORY makes. Null with a message in ERROR (may be null) when the
     // file cannot be read, is malformed or a target's description does not load; nothing else
     // is touched then. An item whose object does not bind stays, with its status recorded and
-    // its properties as they were read, so saving the project loses nothing of it.
+    // its properties as they were read, so saving the project loses nothing of it. The file is
+    // locked before it is read and stays locked, so that no other process changes it before
+    // this project's save; another process's lock is waited for (ProjectLock::kWait), then the
+    // open is refused.
     static std::unique_ptr<Project> Open(const std::string& path,
                                          resources::ResourceService& service, std::string* error,
                                          ObjectFactory factory = {});
@@ -112,6 +118,7 @@ private:
     std::vector<qv::com::ComPtr<IwbProjectProvider>> providers_;
     ObjectFactory factory_;
     uint64_t nextSequence_ = 0;
+    ProjectLock lock_;
 };
 
 } // namespace wbhost::project
