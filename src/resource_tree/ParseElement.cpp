@@ -265,7 +265,8 @@ void ParseStack::ProcessInclude(Frame& frame, const std::u16string& path,
             SubstituteInSubtree(*included, ContextVariables(), 0);
         else
             AddError(node, u"Unable to find include file node: " +
-                               FromUtf8Lenient(JoinFilePath(directory, qv::kern::WideToStandardUtf8(path))));
+                               FromUtf8Lenient(
+                                   JoinFilePath(directory, qv::kern::WideToStandardUtf8(path))));
     } catch (const qv::kern::osdep::OSException&) {
         context_.innermost = outer;
         AddError(node, u"Encountered an OS exception.");

@@ -31,6 +31,26 @@ TEST(CliAttributeSet, NestedSetsAreNamedByTheirPath) {
     EXPECT_EQ(*read, (std::vector<SetAttribute>{{u"resource", u"AI0"}, {u"/Scaling/Gain", u"2"}}));
 }
 
+// Sets as deep as the module reads are read; deeper ones fail instead of taking memory by the
+// square of their depth (100,000 levels of long names took tens of GB).
+TEST(CliAttributeSet, NestingIsBoundedAsTheModuleBoundsIt) {
+    auto nested = [](size_t levels, size_t nameLength = 200) {
+        const std::u16string name(nameLength, u'n');
+        std::u16string text;
+        for (size_t i = 0; i < levels; ++i)
+            text += u"<AttributeSet name=\"" + name + u"\">";
+        text += u"<Attribute name=\"x\"><Value>1</Value></Attribute>";
+        for (size_t i = 0; i < levels; ++i)
+            text += u"</AttributeSet>";
+        return text;
+    };
+    const auto deepest = ReadAttributeSet(nested(256));
+    ASSERT_TRUE(deepest);
+    EXPECT_EQ(deepest->front().first.size(), 255u * 201u + 2u);
+    EXPECT_FALSE(ReadAttributeSet(nested(257)));
+    EXPECT_FALSE(ReadAttributeSet(nested(100000, 1)));
+}
+
 TEST(CliAttributeSet, RefusesWhatIsNoAttributeSet) {
     for (const std::u16string text :
          {u"", u"resource=AI0", u"<AttributeSet name=\"\">", u"<Target><Line>1</Line></Target>",

@@ -26,8 +26,18 @@ void AppendAttribute(std::u16string_view name, std::u16string_view value, std::u
 // sets; anything unexpected fails the read.
 class SetReader : public wbhw::ExPatHandler {
 public:
+    // As deep as the module's own reader goes; a set nested deeper fails the read. Each level
+    // keeps its whole path, so an unbounded depth costs memory by the square of it.
+    static constexpr size_t kMaxNesting = 256;
+
     void StartElement(const std::u16string& name, const wbhw::XmlAttributes& attrs) override {
+        if (failed_)
+            return;
         if (qv::kern::EqualsNoCase(name, u"AttributeSet")) {
+            if (sets_.size() >= kMaxNesting) {
+                failed_ = true;
+                return;
+            }
             // The root set has no path of its own; nested sets add "/name".
             sets_.push_back(sets_.empty()
                                 ? std::u16string()
@@ -42,6 +52,8 @@ public:
         }
     }
     void EndElement(const std::u16string& name) override {
+        if (failed_)
+            return;
         if (qv::kern::EqualsNoCase(name, u"AttributeSet") && !sets_.empty()) {
             sets_.pop_back();
         } else if (qv::kern::EqualsNoCase(name, u"Value") && attribute_) {
