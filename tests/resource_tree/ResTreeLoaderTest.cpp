@@ -43,8 +43,8 @@ TEST(ResTreeLoader, FilesLoadAlikeWhereverTheBlocksEnd) {
     EXPECT_EQ(root->ParseFile(dir.Write("exact.xml", exact), false), 0);
     EXPECT_EQ(TextOf(*root, u"V").size(), 4096u - 8 - 11);
     // A token of many blocks makes the blocks grow; what follows it still loads whole.
-    const std::string huge = "<Top><A v=\"" + std::string(300000, 'v') + "\"/>" +
-                             BlockDocument(10, 150).substr(5);
+    const std::string huge =
+        "<Top><A v=\"" + std::string(300000, 'v') + "\"/>" + BlockDocument(10, 150).substr(5);
     auto grown = NewRoot();
     ASSERT_EQ(grown->ParseFile(dir.Write("huge.xml", huge), false), 0);
     EXPECT_EQ(grown->EntryCount(), 152u);
