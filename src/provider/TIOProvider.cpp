@@ -3,10 +3,10 @@
 
 #include "com/ComInit.h"
 #include "framework/IqxProjectItemValidator.h"
+#include "items/TIOStrings.h"
 #include "provider/TIOIdentifiers.h"
 #include "provider/TIOItemRegistry.h"
 #include "provider/TIOModule.h"
-#include "provider/TIOStrings.h"
 
 using qv::com::ComPtr;
 
@@ -15,6 +15,18 @@ HRESULT TIOProvider::Initialize(IUnknown* site) {
     projectRoot_ = ProjectRoot();
     tio::ModuleInstance();
     return hr;
+}
+
+HRESULT TIOProvider::GetSite(IUnknown** site) {
+    if (!site) {
+        return E_POINTER;
+    }
+    *site = projectRoot_;
+    if (!projectRoot_) {
+        return E_UNEXPECTED;
+    }
+    projectRoot_->AddRef();
+    return S_OK;
 }
 
 HRESULT TIOProvider::CreateItemHook(const CqxItemRequest& request, IUnknown** item) {

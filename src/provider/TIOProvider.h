@@ -4,11 +4,12 @@
 
 #include "com/ComPtr.h"
 #include "framework/CqxProvider.h"
+#include "framework/IqxProviderSite.h"
 #include "host/contracts/IwbProjectProvider.h"
 
-class TIOProvider : public CqxProvider, public IwbProjectProvider {
+class TIOProvider : public CqxProvider, public IwbProjectProvider, public IqxProviderSite {
 public:
-    using Interfaces = CqxProvider::Interfaces::Append<IwbProjectProvider>;
+    using Interfaces = CqxProvider::Interfaces::Append<IwbProjectProvider, IqxProviderSite>;
 
     // Runs the base initialisation, keeps the framework's root object and records the module
     // handle; answers the base's result.
@@ -22,6 +23,9 @@ public:
     HRESULT Detach() override;
     HRESULT ProjectSaving() override;
     HRESULT ProjectSaved() override;
+
+    // IqxProviderSite: the root object, for the items' program runs.
+    HRESULT GetSite(IUnknown** site) override;
 
     // The framework's root object kept at initialisation (no reference added); null before.
     IUnknown* projectRoot() const { return projectRoot_; }

@@ -11,7 +11,7 @@
 #include "items/TIOInstanceItemUI.h"
 #include "provider/ProviderEntry.h"
 #include "provider/TIOIdentifiers.h"
-#include "provider/TIOStrings.h"
+#include "items/TIOStrings.h"
 
 #include <gtest/gtest.h>
 #include <thread>

@@ -1,6 +1,6 @@
 // The string table, compiled in. Messages 7, 8 and 9 carry the name placeholders that error
 // information replaces with the item names.
-#include "provider/TIOStrings.h"
+#include "items/TIOStrings.h"
 
 #include <algorithm>
 #include <array>
