@@ -24,17 +24,19 @@ std::optional<std::string> AskHostFolder() noexcept {
     WBHandle text = nullptr;
     const WBErr converted = toText(folder, &text);
     destroy(&folder);
-    std::optional<std::string> answer;
+    // A plain string rather than an optional<string> carried across the try block: gcc 12
+    // reports a false "may be used uninitialized" for the optional's move at -O2.
+    std::string answer;
     try {
         if (converted == kWBNoErr && text != nullptr)
             answer = ReadHostString(text);
     } catch (...) {
-        answer.reset();
+        answer.clear();
     }
     if (text != nullptr)
         dispose(text);
-    if (answer && answer->empty())
-        answer.reset();
+    if (answer.empty())
+        return std::nullopt;
     return answer;
 }
 

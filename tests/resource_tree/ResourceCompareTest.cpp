@@ -124,8 +124,12 @@ TEST(ResourceCompare, LongListsAndLongRepeatsCompareInPlainTime) {
     std::string required;
     std::string offered;
     for (int i = 0; i < 40000; ++i) {
-        required += (i != 0 ? "," : "") + std::to_string(i);
-        offered += (i != 0 ? "," : "") + std::to_string(39999 - i);
+        if (i != 0) {
+            required += ',';
+            offered += ',';
+        }
+        required += std::to_string(i);
+        offered += std::to_string(39999 - i);
     }
     const auto sv = [](const std::string& list) {
         return Resource("<SupportedValues>" + list + "</SupportedValues>");

@@ -125,12 +125,15 @@ TEST(TreeCopy, VariablesComeFromOpenElementsOutermostFirst) {
 TEST(TreeCopy, CopiesStayWithinTheEntryBudget) {
     // Each level holds two copies of the level before: without a budget this doubles per line.
     std::u16string doc = u"<Top><Group name='l0'><X>x</X></Group>";
+    const auto level = [](int i) {
+        std::u16string name = u"l";
+        name += static_cast<char16_t>(u'0' + i % 10);
+        name += static_cast<char16_t>(u'a' + i / 10);
+        return name;
+    };
     for (int i = 1; i < 40; ++i) {
-        const std::u16string prev = u"l" +
-                                    std::u16string(1, static_cast<char16_t>(u'0' + (i - 1) % 10)) +
-                                    std::u16string(1, static_cast<char16_t>(u'a' + (i - 1) / 10));
-        const std::u16string me = u"l" + std::u16string(1, static_cast<char16_t>(u'0' + i % 10)) +
-                                  std::u16string(1, static_cast<char16_t>(u'a' + i / 10));
+        const std::u16string prev = level(i - 1);
+        const std::u16string me = level(i);
         doc += u"<Group name='" + me + u"'><Group name='p' prototype='../" + prev +
                u"'/><Group name='q' prototype='../" + prev + u"'/></Group>";
     }
