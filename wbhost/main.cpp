@@ -179,12 +179,14 @@ void AddProject(CLI::App& app, Request& request) {
 void AddEdit(CLI::App& app, Request& request) {
     auto* edit = app.add_subcommand(
         "edit", "change a target's resource tree (rename, remove, insert, set or remove an "
-                "attribute), show what its items now say, and save");
+                "attribute, set a property), show what its items now say, and save");
     edit->footer("  edit PROJECT TARGET rename NODE NEWNAME\n"
                  "  edit PROJECT TARGET remove NODE\n"
                  "  edit PROJECT TARGET insert PARENT DOCUMENT.xml   (PARENT / is the root)\n"
                  "  edit PROJECT TARGET set-attribute NODE NAME VALUE\n"
                  "  edit PROJECT TARGET remove-attribute NODE NAME\n"
+                 "  edit PROJECT TARGET set-property PATH VALUE   (through the module: the end "
+                 "of PATH that names no node is the property of the deepest node it names)\n"
                  "NODE and PARENT are paths in the target's tree, such as Connector0/DIO3. The "
                  "changed tree is kept beside the project as PROJECT.TARGET.xml; the original "
                  "description is never rewritten.");
@@ -196,7 +198,8 @@ void AddEdit(CLI::App& app, Request& request) {
     edit->add_option("TARGET", edits->target, "the target's name")->required();
     edit->add_option("ACTION", *action, "what to change")
         ->required()
-        ->check(CLI::IsMember({"rename", "remove", "insert", "set-attribute", "remove-attribute"}));
+        ->check(CLI::IsMember(
+            {"rename", "remove", "insert", "set-attribute", "remove-attribute", "set-property"}));
     edit->add_option("ARGS", *arguments,
                      "the node, then the new name, the document file or the attribute");
     edit->callback([&request, path, edits, action, arguments] {

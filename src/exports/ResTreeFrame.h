@@ -4,6 +4,7 @@
 
 #include "com/ComPtr.h"
 #include "host/HostString.h"
+#include "host/StatusError.h"
 #include "host/binding/HostFunctions.h"
 #include "host/contracts/IwbhwResourceTreeAccess.h"
 #include "host/errors/HostErrorToHResult.h"
@@ -17,17 +18,29 @@
 namespace qv::exports {
 
 // Runs BODY and turns whatever it throws into a status: host errors through the host-error
-// table, the rest as out of memory or general failure. Nothing reaches the host.
+// table, a failing host interface call as its own status, the rest as out of memory or general
+// failure. Nothing reaches the host.
 template <class Body> int32_t AnswerStatus(Body&& body) noexcept {
     try {
         return body();
     } catch (const host::errors::WBErrorException& e) {
         return host::errors::HostErrorToHResult(e.code());
+    } catch (const host::StatusError& e) {
+        return e.Status();
     } catch (const std::bad_alloc&) {
         return E_OUTOFMEMORY;
     } catch (...) {
         return E_FAIL;
     }
+}
+
+// The interface I of the object behind the refnum at REFNUM in OBJECT: the host's status as it
+// came when it fails, E_NOINTERFACE for a host that answers success without an object.
+template <class I> HRESULT QueryRefnum(const WBRefNum* refnum, com::ComPtr<I>& object) {
+    const HRESULT hr = host::rt::QueryInterfaceForWBRefNum(refnum, &I::iid, object.PutVoid());
+    if (FAILED(hr))
+        return hr;
+    return object ? S_OK : E_NOINTERFACE;
 }
 
 // The frame: clears *FOUND, gets the tree's IwbhwResourceTreeAccess from the refnum at REFNUM
@@ -42,12 +55,9 @@ int32_t WithFoundNode(const WBRefNum* refnum, qv::host::HostString path, uint8_t
     *found = 0;
     return AnswerStatus([&]() -> int32_t {
         com::ComPtr<IwbhwResourceTreeAccess> tree;
-        HRESULT hr = host::rt::QueryInterfaceForWBRefNum(refnum, &IwbhwResourceTreeAccess::iid,
-                                                         tree.PutVoid());
+        HRESULT hr = QueryRefnum(refnum, tree);
         if (FAILED(hr))
             return hr;
-        if (!tree)
-            return E_NOINTERFACE; // a host that answers success without an object
         const std::u16string nodePath = kern::AnsiToWide(host::ReadHostString(path));
         com::ComPtr<IwbhwResourceTreeAccess> node;
         hr = tree->FindNode(nodePath.c_str(), nullptr, 0, node.Put());

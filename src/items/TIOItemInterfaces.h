@@ -32,7 +32,9 @@ struct IwbTIOItemUIPrivate : IUnknown {
     static constexpr IID iid = qv::com::ParseGuid("6AEC313F-76E0-460E-982D-68E3BEE06341");
 
     // Applies COUNT cluster texts (name and value of one attribute each) to the item's working
-    // set, then binds again. The first text that does not parse stops it with its status.
+    // set, then binds again. The first text that does not parse stops the applying (the texts
+    // before it stay applied); the item binds all the same, and answers the binding's failure,
+    // else that text's status.
     virtual HRESULT SetAttributes(uint32_t count, const char16_t* const* texts) = 0;
     // The name the resource suggests for the item in NAME (null when empty); FROMRESOURCE
     // (optional) receives 0 when it came from the node's "NameDecoration", else 1.

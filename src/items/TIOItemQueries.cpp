@@ -144,7 +144,10 @@ HRESULT TIOInstanceItemUI::SetAttributes(uint32_t count, const char16_t* const* 
             list.emplace_back(texts[i] != nullptr ? texts[i] : u"");
         return workingSet_->ImportClusterStrings(list);
     });
-    return FAILED(imported) ? imported : BindToResource(nullptr, 0, 0);
+    // The texts before a bad one are applied already: the item binds to what it now holds in
+    // any case, and a bad text is still reported once the binding went well.
+    const HRESULT bound = BindToResource(nullptr, 0, 0);
+    return FAILED(bound) ? bound : imported;
 }
 
 HRESULT TIOInstanceItemUI::GetDecoratedName(BSTR* name, int32_t* fromResource) {

@@ -282,6 +282,12 @@ void PlayEdits(Transcript& script, const HostOptions& options, const WorkFolder&
          {read, "Signature", "boolean read(u8 port)"},
          {0, {"Valve: bound, resource \"/RearConnector/DIO3\", feature set 1"}, {}});
     edit("A node that is not there", "remove", {"AnalogInputs/AI9"}, {1, {"has no node"}, {}});
+    edit("Set a property through the module on a path whose last piece names no node: the "
+         "deepest node it names takes it",
+         "set-property", {"RearConnector/DIO3/Label", "Valve line"},
+         {0, {"set the property Label=\"Valve line\" on /RearConnector/DIO3"}, {}});
+    edit("A path that leaves the tree before its last piece sets nothing", "set-property",
+         {"RearConnector/DIO9/Label", "x"}, {1, {"nothing was set"}, {}});
     script.Step(
         "Reopen the saved project: every item binds back to the same status",
         "project list " + project + " --json", {0, {"\"featureSetVersion\": 1"}, {}},

@@ -2,13 +2,17 @@
 #include "cli/EditCommands.h"
 
 #include "cli/HostText.h"
+#include "cli/HostedModule.h"
 #include "cli/ItemListing.h"
 #include "cli/ItemStates.h"
 #include "project/AtomicFile.h"
+#include "project/HexStatus.h"
 #include "resource_tree/ResTreeWriter.h"
 #include "resources/InputFile.h"
+#include "resources/NodeLookup.h"
 
 #include <filesystem>
+#include <new>
 #include <optional>
 #include <ostream>
 
@@ -91,8 +95,43 @@ bool ApplyEdit(resources::ResourceTree& tree, const EditRequest& request, std::o
     case EditKind::SetAttribute:
     case EditKind::RemoveAttribute:
         return ApplyAttributeEdit(tree, *node, request, out, err);
+    case EditKind::SetProperty:
+        break; // through the module: ApplyPropertyEdit
     }
     return false;
+}
+
+// Sets the property REQUEST names through the module's TIOResTree_SetProperty, with the host
+// strings a host program hands it; false with the reason on ERR.
+bool ApplyPropertyEdit(const session::HostSession& session, const resources::Target& target,
+                       const EditRequest& request, std::ostream& out, std::ostream& err) {
+    using SetPropertyFn = int32_t(const WBRefNum*, WBHandle, WBHandle, uint8_t*);
+    auto* setProperty = session.Module()->Find<SetPropertyFn>("TIOResTree_SetProperty");
+    if (setProperty == nullptr) {
+        err << "wbhost: the module does not export TIOResTree_SetProperty\n";
+        return false;
+    }
+    const std::u16string path = FromUtf8(request.node);
+    const resources::NodeLookup reached = target.tree->Lookup(path);
+    const OwnedHandle hostPath = NewHostString(ToHostText(request.node));
+    const OwnedHandle value = NewHostString(ToHostText(request.argument));
+    if (!hostPath || !value)
+        throw std::bad_alloc();
+    uint8_t set = 0;
+    const int32_t status = setProperty(&target.refnum, hostPath.get(), value.get(), &set);
+    if (status != 0) {
+        err << "wbhost: the module could not set " << request.node << " (status "
+            << HexStatus(status) << ")\n";
+        return false;
+    }
+    if (set == 0) {
+        err << "wbhost: nothing was set: the end of \"" << request.node
+            << "\" is no single property name below an existing node\n";
+        return false;
+    }
+    out << "set the property " << ToUtf8(path.substr(reached.matched)) << "=\"" << request.argument
+        << "\" on " << ToUtf8(reached.deepest->Path()) << "\n";
+    return true;
 }
 
 // Writes TREE to the file KEPT, atomically; PREVIOUS receives what KEPT held (nullopt: there
@@ -143,6 +182,7 @@ bool ParseEdit(const std::string& action, const std::vector<std::string>& argume
         {"insert", EditKind::Insert, 2, "insert PARENT DOCUMENT.xml"},
         {"set-attribute", EditKind::SetAttribute, 3, "set-attribute NODE NAME VALUE"},
         {"remove-attribute", EditKind::RemoveAttribute, 2, "remove-attribute NODE NAME"},
+        {"set-property", EditKind::SetProperty, 2, "set-property PATH VALUE"},
     };
     for (const Shape& shape : kShapes) {
         if (action != shape.action)
@@ -158,7 +198,7 @@ bool ParseEdit(const std::string& action, const std::vector<std::string>& argume
         return true;
     }
     error = "unknown edit \"" + action +
-            "\" (rename, remove, insert, set-attribute or remove-attribute)";
+            "\" (rename, remove, insert, set-attribute, remove-attribute or set-property)";
     return false;
 }
 
@@ -181,8 +221,12 @@ int RunEdit(const HostOptions& options, const std::string& projectPath, const Ed
     ProjectItem* target = FindTarget(project, request.target, err);
     if (target == nullptr)
         return 1;
-    resources::ResourceTree& tree = *project.TargetOf(*target)->Target().tree;
-    if (!ApplyEdit(tree, request, out, err))
+    const resources::Target& hardware = project.TargetOf(*target)->Target();
+    resources::ResourceTree& tree = *hardware.tree;
+    const bool applied = request.kind == EditKind::SetProperty
+                             ? ApplyPropertyEdit(session, hardware, request, out, err)
+                             : ApplyEdit(tree, request, out, err);
+    if (!applied)
         return 1;
 
     // The project refers to its targets' descriptions, so the changed tree must outlive this

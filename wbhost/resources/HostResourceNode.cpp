@@ -7,6 +7,7 @@
 #include "resource_tree/ResTreeWriter.h"
 
 #include <new>
+#include <optional>
 
 namespace wbhost::resources {
 namespace {
@@ -40,6 +41,18 @@ template <class I> HRESULT PutArray(const std::vector<I*>& items, uint32_t* coun
             item->AddRef();
     }
     return hr;
+}
+
+// The property that NAME (the rest of a path after the part that named nodes) stands for; none
+// when it is no single piece of a path.
+std::optional<std::u16string> PropertyName(std::u16string_view name) {
+    if (!name.empty() && name.front() == u'/')
+        name.remove_prefix(1);
+    std::vector<std::u16string> pieces = wbhw::SplitListText(name, u'/', false);
+    if (pieces.size() != 1 || pieces.front().empty() || pieces.front() == u"." ||
+        pieces.front() == u"..")
+        return std::nullopt;
+    return std::move(pieces.front());
 }
 
 } // namespace
@@ -196,14 +209,25 @@ HRESULT HostResourceNode::FindNode(const char16_t* path, uint32_t* matched, uint
     if (node == nullptr)
         return E_POINTER;
     *node = nullptr;
-    qv::com::ComPtr<IwbhwResourceTreeNode> found;
-    const HRESULT hr = FindNode(path, matched, found.Put());
-    if (hr != S_OK)
-        return hr;
-    // Every node object offers both interfaces; this one is the same object's other face.
-    *node = static_cast<HostResourceNode*>(found.Get());
-    (*node)->AddRef();
-    return S_OK;
+    return WithNode([&](ResTreeNode& from) {
+        const NodeLookup found = tree_->Lookup(View(path), &from);
+        if (matched != nullptr)
+            *matched = found.matched;
+        // Where the path leaves the tree is handed out only to a caller that asked how far it
+        // went; one that did not would take the node for the one the path names.
+        ResTreeNode* answer =
+            found.node != nullptr || matched == nullptr ? found.node : found.deepest;
+        if (answer != nullptr) {
+            qv::com::ComPtr<IwbhwResourceTreeNode> object;
+            const HRESULT hr = tree_->NodeObject(answer, object.Put());
+            if (FAILED(hr))
+                return hr;
+            // Every node object offers both interfaces; this one is the same object's other face.
+            *node = static_cast<HostResourceNode*>(object.Get());
+            (*node)->AddRef();
+        }
+        return found.node != nullptr ? S_OK : S_FALSE;
+    });
 }
 
 HRESULT HostResourceNode::AddObserver(IwbhwResourceTreeNodeObserver* observer, uint32_t mask,
@@ -301,7 +325,10 @@ HRESULT HostResourceNode::GetSupportedProtocols(uint32_t* count, BSTR** protocol
 }
 
 HRESULT HostResourceNode::SetProperty(const char16_t* name, const char16_t* value) {
-    return SetAttribute(name, value);
+    const std::optional<std::u16string> property = PropertyName(View(name));
+    if (!property)
+        return S_FALSE;
+    return SetAttribute(property->c_str(), value);
 }
 
 HRESULT HostResourceNode::InsertSubTree(const char16_t* xml) {

@@ -46,12 +46,12 @@ NodeLookup FindDescendant(wbhw::ResTreeNode& from, std::u16string_view path) {
         else
             next = current->NodeAt(current->FindLoading(piece));
         if (next == nullptr)
-            return {nullptr, Count(matched)};
+            return {nullptr, Count(matched), current};
         current = next;
         matched = end;
         at = end + 1;
     }
-    return {current, Count(path.size())};
+    return {current, Count(path.size()), current};
 }
 
 } // namespace wbhost::resources

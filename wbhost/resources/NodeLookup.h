@@ -14,6 +14,9 @@ struct NodeLookup {
     // Characters of the path, from its start, up to the end of the last piece that named a node
     // (the whole length when the node was found).
     uint32_t matched = 0;
+    // The node that those characters name: NODE when it was found, else the last node the walk
+    // reached (the start node when no piece named one). Never null.
+    wbhw::ResTreeNode* deepest = nullptr;
 };
 
 // Walks PATH from FROM: pieces are separated by "/" ("\/" and "\\" stand for a "/" and a

@@ -39,11 +39,15 @@ NodeState& ResourceTree::StateOf(wbhw::ResTreeNode& node) {
 
 wbhw::ResTreeNode* ResourceTree::Find(std::u16string_view path, wbhw::ResTreeNode* from,
                                       uint32_t* matched) {
-    const std::lock_guard guard(mutex_);
-    const NodeLookup found = FindDescendant(from != nullptr ? *from : *root_, path);
+    const NodeLookup found = Lookup(path, from);
     if (matched != nullptr)
         *matched = found.matched;
     return found.node;
+}
+
+NodeLookup ResourceTree::Lookup(std::u16string_view path, wbhw::ResTreeNode* from) {
+    const std::lock_guard guard(mutex_);
+    return FindDescendant(from != nullptr ? *from : *root_, path);
 }
 
 HRESULT ResourceTree::NodeObject(wbhw::ResTreeNode* node, IwbhwResourceTreeNode** out) {

@@ -7,6 +7,7 @@
 #include "host/contracts/IwbhwResourceTreeNode.h"
 #include "host/contracts/IwbhwResourceTreeNodeObserver.h"
 #include "resource_tree/ResTreeNode.h"
+#include "resources/NodeLookup.h"
 
 #include <cstdint>
 #include <memory>
@@ -53,6 +54,9 @@ public:
     // The node at PATH below FROM (the root when null), or null; see FindDescendant.
     wbhw::ResTreeNode* Find(std::u16string_view path, wbhw::ResTreeNode* from = nullptr,
                             uint32_t* matched = nullptr);
+    // The whole answer of the walk along PATH from FROM (the root when null): the node, how much
+    // of PATH matched and the deepest node reached.
+    NodeLookup Lookup(std::u16string_view path, wbhw::ResTreeNode* from = nullptr);
     // The COM object of NODE, with a reference; one object per node while it lives. E_POINTER
     // for a null OUT, E_INVALIDARG for a null node.
     HRESULT NodeObject(wbhw::ResTreeNode* node, IwbhwResourceTreeNode** out);

@@ -1,10 +1,13 @@
 // The memory manager functions of the host runtime, over the handle table.
+#include "runtime/FailureInjection.h"
 #include "runtime/HandleTable.h"
 #include "runtime/Runtime.h"
 
 namespace {
 
+using wbhost::runtime::FailingCall;
 using wbhost::runtime::HandleTable;
+using wbhost::runtime::InjectedFailure;
 
 // Element size of a NumericArrayResize type code, 0 for an unknown code.
 size_t ElementSize(int32_t typeCode) {
@@ -33,6 +36,8 @@ constexpr int32_t kMaxDimensions = 64;
 } // namespace
 
 WBHandle DSNewHandle(size_t size) {
+    if (InjectedFailure(FailingCall::DSNewHandle) != kWBNoErr)
+        return nullptr;
     return HandleTable::Instance().Allocate(size, false);
 }
 
@@ -57,6 +62,8 @@ WBErr NumericArrayResize(int32_t typeCode, int32_t numDims, WBHandle* handle, si
     if (element == 0 || numDims < 1 || numDims > kMaxDimensions || handle == nullptr) {
         return kWBArgErr;
     }
+    if (const WBErr injected = InjectedFailure(FailingCall::NumericArrayResize))
+        return injected;
     // The data follows the dimension sizes, aligned to its element size (at most 8).
     const size_t dims = 4 * static_cast<size_t>(numDims);
     const size_t header = (dims + element - 1) / element * element;

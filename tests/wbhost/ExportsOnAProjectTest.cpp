@@ -1,0 +1,289 @@
+// The module's tree and item exports called as a host program calls them: through dlopen, with
+// refnums, host strings and host arrays, on a real target's tree and real items of a project.
+#include "HostArrays.h"
+#include "ProjectTestSupport.h"
+#include "cli/HostText.h"
+#include "cli/HostedModule.h"
+#include "items/TIOItemInterfaces.h"
+#include "provider/TIOIdentifiers.h"
+#include "runtime/FailureInjection.h"
+#include "runtime/RefnumTable.h"
+#include "session/HostSession.h"
+
+#include <gtest/gtest.h>
+
+using namespace projecttest;
+using hostarrays::HostArray;
+using qv::com::ComPtr;
+using wbhost::cli::HostStringBytes;
+using wbhost::cli::NewHostString;
+using wbhost::project::ProjectItem;
+using wbhost::project::Property;
+using wbhost::runtime::FailingCall;
+using wbhost::runtime::FailNthCall;
+
+namespace {
+
+using HS = WBHandle;
+using DumpFn = int32_t(const WBRefNum*, HS, HS, uint8_t*);
+using IsReservedFn = int32_t(const WBRefNum*, HS, HS, uint8_t, uint32_t*, uint8_t*);
+using ProtocolsFn = int32_t(const WBRefNum*, HS, WBHandle*, uint8_t*);
+using EditFn = int32_t(const WBRefNum*, HS, HS, uint8_t*);
+using SetAttributesFn = int32_t(const WBRefNum*, WBHandle*);
+using SetOnMultipleFn = int32_t(WBHandle*, WBHandle*);
+
+constexpr const char* kBoard = R"(<Target>
+  <Connector name="C0">
+    <Line name="DIO0"><Protocols>IOResource, Digital</Protocols><Speed>slow</Speed></Line>
+    <Line name="DIO1"><Protocols>IOResource</Protocols></Line>
+    <Line name="DIO2"/>
+  </Connector>
+</Target>
+)";
+
+std::u16string Bag(std::u16string_view resource) {
+    return u"<AttributeSet name=\"\">\n<Attribute name=\"resource\">\n<Value>" +
+           std::u16string(resource) + u"</Value>\n</Attribute>\n</AttributeSet>\n";
+}
+
+std::string Cluster(std::string_view name, std::string_view value) {
+    return "<Cluster><Name></Name><NumElts>2</NumElts><String><Name>name</Name><Val>" +
+           std::string(name) + "</Val></String><String><Name>value</Name><Val>" +
+           std::string(value) + "</Val></String></Cluster>";
+}
+
+class ExportsOnAProject : public ::testing::Test {
+protected:
+    void SetUp() override {
+        std::string error;
+        ASSERT_TRUE(session.Open(WBT_MODULE_PATH, &error)) << error;
+        ASSERT_TRUE(session.NewProject(u"P", &error)) << error;
+        target = session.Project()->AddTarget(u"T", scratch.Write("t.xml", kBoard), &error);
+        ASSERT_TRUE(target) << error;
+        tree = Project().TargetOf(*target.Get())->Target().refnum;
+    }
+    void TearDown() override {
+        for (WBRefNum refnum : refnums_)
+            wbhost::runtime::RefnumTable::Instance().Remove(refnum);
+    }
+
+    template <class Fn> Fn* Export(const char* name) {
+        Fn* fn = session.Module()->Find<Fn>(name);
+        EXPECT_NE(fn, nullptr) << name;
+        return fn;
+    }
+    wbhost::project::Project& Project() { return *session.Project(); }
+    wbhost::resources::ResourceTree& Tree() {
+        return *Project().TargetOf(*target.Get())->Target().tree;
+    }
+    std::u16string Attribute(std::u16string_view path, std::u16string_view name) {
+        const wbhw::WString* text = Tree().Find(path)->TextAt(name);
+        return text != nullptr ? std::u16string(*text) : u"<none>";
+    }
+    // A new item bound to RESOURCE and the refnum a host program would hold for it.
+    WBRefNum AddItem(std::u16string name, std::u16string_view resource) {
+        wbhost::project::PropertyBag::Map properties;
+        properties[u"tioAttrBag"] = Property{Property::Kind::String, Bag(resource), 0};
+        ComPtr<ProjectItem> made;
+        EXPECT_EQ(Project().CreateItem(*target.Get(), tio::kIOItemType, std::move(name), properties,
+                                       &made),
+                  S_OK);
+        items_.push_back(made.Get());
+        refnums_.push_back(wbhost::runtime::RefnumTable::Instance().Add(made->Object()));
+        return refnums_.back();
+    }
+    std::u16string Resource(size_t item) {
+        BSTR path = nullptr;
+        qv::com::QueryAs<IwbhwResourceItemUI>(items_[item]->Object())->GetResourcePath(&path);
+        const qv::com::UniqueBstr held(path);
+        return qv::com::BstrToString(path);
+    }
+
+    ScratchFolder scratch;
+    wbhost::session::HostSession session;
+    ComPtr<ProjectItem> target;
+    WBRefNum tree = 0;
+    std::vector<ProjectItem*> items_;
+    std::vector<WBRefNum> refnums_;
+    wbhost::runtime::FailureScope failures_;
+};
+
+TEST_F(ExportsOnAProject, QueriesAnswerReservationsAndProtocolsAndLeaveOutputsAloneOffTheTree) {
+    auto* isReserved = Export<IsReservedFn>("TIOResTree_IsReserved");
+    auto* protocols = Export<ProtocolsFn>("TIOResTree_GetSupportedProtocols");
+    AddItem(u"Valve", u"/C0/DIO0");
+
+    struct Case {
+        const char* path;
+        const char* protocol;
+        uint32_t reserved;
+        uint8_t found;
+    };
+    // Any protocol, one the node supports (case aside), one it does not; a free node; no node.
+    for (const Case& c :
+         {Case{"C0/DIO0", "", 1, 1}, Case{"C0/DIO0", "digital", 1, 1},
+          Case{"C0/DIO0", "Serial", 0, 1}, Case{"C0/DIO1", "", 0, 1}, Case{"C0/DIO9", "", 0, 0}}) {
+        uint32_t reserved = 7;
+        uint8_t found = 7;
+        EXPECT_EQ(isReserved(&tree, NewHostString(c.path).get(), NewHostString(c.protocol).get(), 1,
+                             &reserved, &found),
+                  S_OK)
+            << c.path;
+        EXPECT_EQ(reserved, c.reserved) << c.path << " " << c.protocol;
+        EXPECT_EQ(found, c.found) << c.path;
+    }
+
+    // The caller's array is resized to the protocols, in the node's order; one that held more
+    // elements gives the extra ones back.
+    HostArray list;
+    HostArray::Strings(list, {"a", "b", "c"});
+    uint8_t found = 7;
+    ASSERT_EQ(protocols(&tree, NewHostString("C0/DIO0").get(), list.Ref(), &found), S_OK);
+    EXPECT_EQ(found, 1);
+    EXPECT_EQ(list.Texts(), (std::vector<std::string>{"IOResource", "Digital"}));
+    // A null handle is allocated for the caller; a path off the tree leaves the array alone.
+    HostArray fresh;
+    ASSERT_EQ(protocols(&tree, NewHostString("C0/DIO1").get(), fresh.Ref(), &found), S_OK);
+    EXPECT_EQ(fresh.Texts(), std::vector<std::string>{"IOResource"});
+    EXPECT_EQ(protocols(&tree, NewHostString("C0/DIO2/X").get(), list.Ref(), &found), S_OK);
+    EXPECT_EQ(found, 0);
+    EXPECT_EQ(list.Texts(), (std::vector<std::string>{"IOResource", "Digital"}));
+
+    // A refnum of something that is no tree: its status, outputs as cleared.
+    uint32_t reserved = 7;
+    found = 7;
+    const WBRefNum item = refnums_.front();
+    EXPECT_EQ(isReserved(&item, NewHostString("").get(), nullptr, 0, &reserved, &found),
+              E_NOINTERFACE);
+    EXPECT_EQ(reserved, 0u);
+    EXPECT_EQ(found, 0);
+}
+
+TEST_F(ExportsOnAProject, EditsInsertRemoveAndSetPropertiesWhereThePathLeavesTheTree) {
+    auto* insert = Export<EditFn>("TIO_InsertSubTree");
+    auto* remove = Export<EditFn>("TIO_RemoveSubTree");
+    auto* setProperty = Export<EditFn>("TIOResTree_SetProperty");
+    const WBRefNum item = AddItem(u"Late", u"/C0/DIO7");
+    EXPECT_EQ(Resource(0), u"/C0/DIO7");
+
+    // A part inserted under the connector: the item waiting for it binds.
+    uint8_t found = 7;
+    const auto line = NewHostString("<Line name=\"DIO7\"><Protocols>IOResource</Protocols></Line>");
+    ASSERT_EQ(insert(&tree, NewHostString("C0").get(), line.get(), &found), S_OK);
+    EXPECT_EQ(found, 1);
+    ASSERT_NE(Tree().Find(u"/C0/DIO7"), nullptr);
+    EXPECT_EQ(Tree().QueryReservation(*Tree().Find(u"/C0/DIO7"), items_[0]), S_OK);
+    // Under a path naming nothing, nothing is inserted; a document that does not load fails.
+    EXPECT_EQ(insert(&tree, NewHostString("C9").get(), line.get(), &found), S_OK);
+    EXPECT_EQ(found, 0);
+    EXPECT_EQ(insert(&tree, NewHostString("C0").get(), NewHostString("<Line").get(), &found),
+              E_FAIL);
+    EXPECT_EQ(found, 1);
+
+    // The last piece of the path names no node: it is the property of the deepest node. An
+    // existing text entry is changed the same way.
+    found = 0;
+    ASSERT_EQ(setProperty(&tree, NewHostString("C0/DIO0/Colour").get(), NewHostString("red").get(),
+                          &found),
+              S_OK);
+    EXPECT_EQ(found, 1);
+    EXPECT_EQ(Attribute(u"/C0/DIO0", u"Colour"), u"red");
+    ASSERT_EQ(setProperty(&tree, NewHostString("/C0/DIO0/Speed").get(), NewHostString("fast").get(),
+                          &found),
+              S_OK);
+    EXPECT_EQ(Attribute(u"/C0/DIO0", u"Speed"), u"fast");
+    // Paths whose rest is no single property set nothing and say so: two pieces missing, a path
+    // naming a node, a name of a child. *FOUND is written only at the end: a failure before it
+    // leaves the caller's value.
+    for (const char* path : {"C0/DIO9/Colour", "C0/DIO0", "C0/DIO0/..", "C0"}) {
+        found = 7;
+        EXPECT_EQ(setProperty(&tree, NewHostString(path).get(), NewHostString("x").get(), &found),
+                  S_OK);
+        EXPECT_EQ(found, 0) << path;
+    }
+    EXPECT_EQ(Attribute(u"/C0", u"DIO9"), u"<none>");
+    found = 7;
+    EXPECT_EQ(setProperty(&item, NewHostString("C0/X").get(), nullptr, &found), E_NOINTERFACE);
+    EXPECT_EQ(found, 7);
+
+    // The part goes again: the item is missing its resource.
+    ASSERT_EQ(remove(&tree, NewHostString("C0").get(), NewHostString("DIO7").get(), &found), S_OK);
+    EXPECT_EQ(found, 1);
+    EXPECT_EQ(Tree().Find(u"/C0/DIO7"), nullptr);
+    int32_t status = -1;
+    qv::com::QueryAs<IwbTIOInstanceItemUI>(items_[0]->Object())->GetResourceStatus(&status);
+    EXPECT_EQ(status, 1);
+}
+
+TEST_F(ExportsOnAProject, AttributesReachOneItemOrOneTextEachOfSeveral) {
+    auto* setAttributes = Export<SetAttributesFn>("TIO_SetAttributes");
+    auto* setOnMultiple = Export<SetOnMultipleFn>("TIO_SetAttributesOnMultiple");
+    const WBRefNum a = AddItem(u"A", u"/C0/DIO0");
+    const WBRefNum b = AddItem(u"B", u"/C0/DIO1");
+
+    // A new resource through the attributes: the item binds to it.
+    HostArray texts;
+    HostArray::Strings(texts, {Cluster("resource", "/C0/DIO2"), Cluster("Colour", "red")});
+    ASSERT_EQ(setAttributes(&a, texts.Ref()), S_OK);
+    EXPECT_EQ(Resource(0), u"/C0/DIO2");
+    EXPECT_EQ(Tree().QueryReservation(*Tree().Find(u"/C0/DIO2"), items_[0]), S_OK);
+    // A text that does not parse is reported, and what came before it is applied and bound.
+    HostArray bad;
+    HostArray::Strings(bad, {Cluster("resource", "/C0/DIO0"), "<Cluster>", Cluster("x", "y")});
+    EXPECT_TRUE(FAILED(setAttributes(&a, bad.Ref())));
+    EXPECT_EQ(Resource(0), u"/C0/DIO0");
+    EXPECT_EQ(Tree().QueryReservation(*Tree().Find(u"/C0/DIO0"), items_[0]), S_OK);
+
+    // Text i to item i. Fewer refnums than texts is refused before any item changes: the
+    // caller's count is the end of its block.
+    HostArray both;
+    HostArray::Refnums(both, {a, b});
+    HostArray one;
+    HostArray::Refnums(one, {b});
+    HostArray two;
+    HostArray::Strings(two, {Cluster("resource", "/C0/DIO1"), Cluster("resource", "/C0/DIO2")});
+    EXPECT_EQ(setOnMultiple(one.Ref(), two.Ref()), E_INVALIDARG);
+    EXPECT_EQ(Resource(1), u"/C0/DIO1");
+    ASSERT_EQ(setOnMultiple(both.Ref(), two.Ref()), S_OK);
+    EXPECT_EQ(Resource(0), u"/C0/DIO1");
+    EXPECT_EQ(Resource(1), u"/C0/DIO2");
+    // No texts touch no refnum at all, not even a missing array of them.
+    HostArray none;
+    HostArray::Strings(none, {});
+    EXPECT_EQ(setOnMultiple(nullptr, none.Ref()), S_OK);
+    // A refnum that is no item stops the walk with its status; the items before it stay changed.
+    HostArray withTree;
+    HostArray::Refnums(withTree, {a, tree});
+    EXPECT_EQ(setOnMultiple(withTree.Ref(), two.Ref()), E_NOINTERFACE);
+    EXPECT_EQ(Resource(0), u"/C0/DIO1");
+}
+
+TEST_F(ExportsOnAProject, AHostErrorWhileWritingComesBackMappedWithTheOutputUnchanged) {
+    auto* dump = Export<DumpFn>("TIOResTree_Dump");
+    auto* protocols = Export<ProtocolsFn>("TIOResTree_GetSupportedProtocols");
+    const struct {
+        WBErr error;
+        int32_t status;
+    } mappings[] = {{kWBMemFullErr, E_OUTOFMEMORY},
+                    {kWBNotSupported, E_NOTIMPL},
+                    {kWBFileNotFound, static_cast<int32_t>(0x80030002)},
+                    {kWBArgErr, E_INVALIDARG},
+                    {kWBGenericErr, E_FAIL}};
+    // Everything the caller hands in is made before the failure is armed.
+    const auto connector = NewHostString("C0");
+    const auto line = NewHostString("C0/DIO0");
+    for (const auto& m : mappings) {
+        const auto text = NewHostString("old");
+        HostArray list;
+        HostArray::Strings(list, {"x", "y"});
+        uint8_t found = 0;
+        FailNthCall(FailingCall::NumericArrayResize, 1, m.error);
+        EXPECT_EQ(dump(&tree, connector.get(), text.get(), &found), m.status);
+        EXPECT_EQ(HostStringBytes(text.get()), "old");
+        FailNthCall(FailingCall::NumericArrayResize, 1, m.error);
+        EXPECT_EQ(protocols(&tree, line.get(), list.Ref(), &found), m.status);
+        EXPECT_EQ(list.Texts(), (std::vector<std::string>{"x", "y"}));
+    }
+}
+
+} // namespace
