@@ -7,6 +7,7 @@
 #include "provider/TIOIdentifiers.h"
 #include "provider/TIOItemRegistry.h"
 #include "provider/TIOModule.h"
+#include "provider/TIONameControl.h"
 
 using qv::com::ComPtr;
 
@@ -92,4 +93,30 @@ HRESULT TIOProvider::ProjectSaving() {
 
 HRESULT TIOProvider::ProjectSaved() {
     return S_OK;
+}
+
+HRESULT TIOProvider::ListCategories(uint32_t* count, BSTR** categories) {
+    return tio::namecontrol::ListCategories(count, categories);
+}
+
+HRESULT TIOProvider::ListNames(WBRefNum appRef, WBVariant data, uint32_t* count, BSTR** names,
+                               WBHandle* nameList, int32_t* status) {
+    return tio::namecontrol::ListNames(appRef, data, count, names, nameList, status);
+}
+
+HRESULT TIOProvider::CheckTarget(WBRefNum appRef, WBHandle* nameList, int32_t* status) {
+    return tio::namecontrol::CheckTarget(appRef, nameList, status);
+}
+
+HRESULT TIOProvider::Configure(uint64_t value, int32_t* status) {
+    return tio::namecontrol::Configure(projectRoot_, value, status);
+}
+
+HRESULT TIOProvider::Query(uint32_t mode, WBRefNum appRef, WBVariant input, WBVariant output,
+                           int32_t* status) {
+    return tio::namecontrol::Query(mode, appRef, input, output, status);
+}
+
+HRESULT TIOProvider::OnSelect(WbNameControlEvent* event) {
+    return tio::namecontrol::OnSelect(projectRoot_, event);
 }

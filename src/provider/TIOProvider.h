@@ -5,11 +5,16 @@
 #include "com/ComPtr.h"
 #include "framework/CqxProvider.h"
 #include "framework/IqxProviderSite.h"
+#include "host/contracts/IwbProjectNameProvider.h"
 #include "host/contracts/IwbProjectProvider.h"
 
-class TIOProvider : public CqxProvider, public IwbProjectProvider, public IqxProviderSite {
+class TIOProvider : public CqxProvider,
+                    public IwbProjectProvider,
+                    public IqxProviderSite,
+                    public IwbProjectNameProvider {
 public:
-    using Interfaces = CqxProvider::Interfaces::Append<IwbProjectProvider, IqxProviderSite>;
+    using Interfaces = CqxProvider::Interfaces::Append<IwbProjectProvider, IqxProviderSite,
+                                                       IwbProjectNameProvider>;
 
     // Runs the base initialisation, keeps the framework's root object and records the module
     // handle; answers the base's result.
@@ -26,6 +31,19 @@ public:
 
     // IqxProviderSite: the root object, for the items' program runs.
     HRESULT GetSite(IUnknown** site) override;
+
+    // IwbProjectNameProvider: the I/O name controls' names and programs (TIONameControl).
+    HRESULT ListCategories(uint32_t* count, BSTR** categories) override;
+    HRESULT ListNames(WBRefNum appRef, WBVariant data, uint32_t* count, BSTR** names,
+                      WBHandle* nameList, int32_t* status) override;
+    HRESULT Reserved3() override { return S_OK; }
+    HRESULT Reserved4() override { return S_OK; }
+    HRESULT CheckTarget(WBRefNum appRef, WBHandle* nameList, int32_t* status) override;
+    HRESULT Configure(uint64_t value, int32_t* status) override;
+    HRESULT Query(uint32_t mode, WBRefNum appRef, WBVariant input, WBVariant output,
+                  int32_t* status) override;
+    HRESULT OnSelect(WbNameControlEvent* event) override;
+    HRESULT Reserved9() override { return S_OK; }
 
     // The framework's root object kept at initialisation (no reference added); null before.
     IUnknown* projectRoot() const { return projectRoot_; }

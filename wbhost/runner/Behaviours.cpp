@@ -51,6 +51,12 @@ Terminals NameControlOutputs(const Terminals&) {
     return {{4, kFalse}};
 }
 
+// This host's name controls have kept one data layout: the upgrade hands the value back as it
+// came.
+Terminals NameControlMutationOutputs(const Terminals& in) {
+    return {{4, InputOr(in, 0, int32_t{0})}};
+}
+
 struct Behaviour {
     std::string_view name;
     Terminals (*outputs)(const Terminals&);
@@ -65,6 +71,7 @@ constexpr std::array kBehaviours = {
     Behaviour{"new-item-wizard", WizardOutputs},
     Behaviour{"name-control-config", NameControlOutputs},
     Behaviour{"name-control-on-select", NameControlOutputs},
+    Behaviour{"name-control-on-mutation", NameControlMutationOutputs},
 };
 
 const Behaviour* Find(const std::string& name) {

@@ -5,6 +5,8 @@
 #include "host/contracts/IwbProjectProvider.h"
 #include "project/HexStatus.h"
 #include "project/ProviderFactory.h"
+#include "runner/EngineHostProgram.h"
+#include "runtime/EngineTable.h"
 #include "session/ProjectLookups.h"
 #include "session/RootObject.h"
 
@@ -27,6 +29,9 @@ bool Fail(std::string* error, std::string message) {
 // The runtime has one resolver for the process; only the session that set it clears it, so
 // closing one session does not cut off another's project.
 const HostSession* resolverOwner = nullptr;
+// The same for the programs run through the engine table: the newest session's program session
+// runs them.
+const HostSession* engineOwner = nullptr;
 
 } // namespace
 
@@ -43,10 +48,16 @@ HostSession::HostSession()
     // Runners keep the finder they were made with; through the link, one made before a project
     // was opened finds its items too, and one kept after it closed finds nothing.
     runners_->SetItemFinder(FinderFor(link_));
+    runtime::SetEngineProgramOpener(runner::EngineProgramOpenerFor(programs_));
+    engineOwner = this;
 }
 
 HostSession::~HostSession() {
     Close();
+    if (engineOwner == this) {
+        runtime::SetEngineProgramOpener({});
+        engineOwner = nullptr;
+    }
     // The provider goes before the module whose code it runs.
     provider_.Reset();
     module_.reset();
