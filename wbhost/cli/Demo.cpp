@@ -282,12 +282,6 @@ void PlayEdits(Transcript& script, const HostOptions& options, const WorkFolder&
          {read, "Signature", "boolean read(u8 port)"},
          {0, {"Valve: bound, resource \"/RearConnector/DIO3\", feature set 1"}, {}});
     edit("A node that is not there", "remove", {"AnalogInputs/AI9"}, {1, {"has no node"}, {}});
-    edit("Set a property through the module on a path whose last piece names no node: the "
-         "deepest node it names takes it",
-         "set-property", {"RearConnector/DIO3/Label", "Valve line"},
-         {0, {"set the property Label=\"Valve line\" on /RearConnector/DIO3"}, {}});
-    edit("A path that leaves the tree before its last piece sets nothing", "set-property",
-         {"RearConnector/DIO9/Label", "x"}, {1, {"nothing was set"}, {}});
     script.Step(
         "Reopen the saved project: every item binds back to the same status",
         "project list " + project + " --json", {0, {"\"featureSetVersion\": 1"}, {}},
@@ -310,7 +304,15 @@ void PlayEdits(Transcript& script, const HostOptions& options, const WorkFolder&
                  {}},
                 [&](std::ostream& out, std::ostream& err) {
                     return RunTree(options.modulePath, kept, read, out, err);
-                });
+                }); // After the kept tree is shown: a change of the line makes its items bind
+                    // again, and they
+    // record the signature as it now reads.
+    edit("Set a property through the module on a path whose last piece names no node: the "
+         "deepest node it names takes it",
+         "set-property", {"RearConnector/DIO3/Label", "Valve line"},
+         {0, {"set the property Label=\"Valve line\" on /RearConnector/DIO3"}, {}});
+    edit("A path that leaves the tree before its last piece sets nothing", "set-property",
+         {"RearConnector/DIO9/Label", "x"}, {1, {"nothing was set"}, {}});
 }
 
 void PlayPrograms(Transcript& script, const HostOptions& options) {

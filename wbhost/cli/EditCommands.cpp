@@ -129,8 +129,11 @@ bool ApplyPropertyEdit(const session::HostSession& session, const resources::Tar
             << "\" is no single property name below an existing node\n";
         return false;
     }
-    out << "set the property " << ToUtf8(path.substr(reached.matched)) << "=\"" << request.argument
-        << "\" on " << ToUtf8(reached.deepest->Path()) << "\n";
+    std::u16string_view property = std::u16string_view(path).substr(reached.matched);
+    if (!property.empty() && property.front() == u'/')
+        property.remove_prefix(1);
+    out << "set the property " << ToUtf8(property) << "=\"" << request.argument << "\" on "
+        << ToUtf8(reached.deepest->Path()) << "\n";
     return true;
 }
 
