@@ -100,13 +100,28 @@ void AddTreeAndCompare(CLI::App& app, Request& request) {
     auto* compare = app.add_subcommand(
         "compare", "tell whether OFFERED satisfies REQUIRED: match (exit 0), not satisfied (1), "
                    "tolerated difference (2)");
-    auto files = std::make_shared<std::pair<std::string, std::string>>();
-    compare->add_option("REQUIRED", files->first, "the required description")->required();
-    compare->add_option("OFFERED", files->second, "the offered description")->required();
+    compare->footer(
+        "  compare REQUIRED OFFERED            the answer\n"
+        "  compare --explain REQUIRED OFFERED  the answer, then what decided it, one line each\n"
+        "                                      exit 0 match, 1 not satisfied, 2 tolerated "
+        "difference,\n"
+        "                                      3 could not run");
+    struct CompareRequest {
+        std::string required;
+        std::string offered;
+        bool explain = false;
+    };
+    auto files = std::make_shared<CompareRequest>();
+    compare->add_option("REQUIRED", files->required, "the required description")->required();
+    compare->add_option("OFFERED", files->offered, "the offered description")->required();
+    compare->add_flag("--explain", files->explain,
+                      "also print what decided the answer: for \"not satisfied\" the required "
+                      "entry the offered description lacks or contradicts, with both texts; for "
+                      "\"tolerated difference\" every entry that made it so");
     compare->callback([&request, files] {
         request.run = [&request, files] {
-            return wbhost::cli::RunCompare(request.host.modulePath, files->first, files->second,
-                                           std::cout, std::cerr);
+            return wbhost::cli::RunCompare(request.host.modulePath, files->required, files->offered,
+                                           files->explain, std::cout, std::cerr);
         };
     });
 }

@@ -108,6 +108,20 @@ uint32_t RefCompare(ResTreeNode* a, ResTreeNode* b) {
     return unmatched != 0 || minor ? 2 : 0;
 }
 
+bool IsShortfall(CompareReason reason) {
+    switch (reason) {
+    case CompareReason::Missing:
+    case CompareReason::TextDiffers:
+    case CompareReason::ValueMissing:
+    case CompareReason::LatencyTooLarge:
+    case CompareReason::KindDiffers:
+    case CompareReason::OfferedEmpty:
+        return true;
+    default:
+        return false;
+    }
+}
+
 // ---- Generated trees. ----
 
 const std::u16string kNames[] = {
@@ -210,8 +224,18 @@ TEST(CompareWalkDifferential, AgreesWithTheRulesReadLiterally) {
         auto qa = makeA();
         auto qb = makeB();
         ASSERT_EQ(CompareNodes(qa.get(), qb.get()), expected) << "explaining changes nothing";
+        // The explanation tells the same answer: a shortfall exactly when not satisfied (the
+        // last finding, tolerated ones met on the way before it), only tolerated differences
+        // when the answer is 2, nothing for a match.
         EXPECT_EQ(why.result, expected);
         EXPECT_EQ(why.findings.empty(), expected == 0) << "round " << round;
+        EXPECT_EQ(why.Shortfall() != nullptr, expected == 1) << "round " << round;
+        for (size_t i = 0; i < why.findings.size(); ++i) {
+            const bool decisive = expected == 1 && i + 1 == why.findings.size();
+            EXPECT_EQ(IsShortfall(why.findings[i].reason), decisive)
+                << "round " << round << " finding " << i;
+            EXPECT_FALSE(why.findings[i].path.empty()) << "round " << round;
+        }
         ++answers[expected];
     }
     // The generator must reach every answer often, or the agreement says little.

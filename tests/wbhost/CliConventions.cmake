@@ -52,6 +52,50 @@ run_wbhost(1 compare ${SCRATCH}/inline.xml ${SCRATCH}/board.xml)
 run_wbhost(0 compare --host-dir ${SCRATCH}/host ${SCRATCH}/inline.xml ${SCRATCH}/board.xml)
 run_wbhost(usage --host-dir ${SCRATCH}/no-such-folder tree ${SCRATCH}/board.xml)
 
+# compare --explain: the answer as plain compare gives it, then what decided it, one line each.
+file(WRITE ${SCRATCH}/need.xml "<Target name=\"T\"><Rate>40</Rate><Mode name=\"M\">"
+     "<SupportedValues>a,b</SupportedValues><MemoryLatency>4</MemoryLatency></Mode></Target>\n")
+file(WRITE ${SCRATCH}/more.xml "<Target name=\"T\"><Rate>40</Rate><Extra>yes</Extra><Mode name=\"M\">"
+     "<SupportedValues>b,A,c</SupportedValues><MemoryLatency>3</MemoryLatency></Mode></Target>\n")
+file(WRITE ${SCRATCH}/slow.xml "<Target name=\"T\"><Rate>40</Rate><Mode name=\"M\">"
+     "<SupportedValues>a,b</SupportedValues><MemoryLatency>9</MemoryLatency></Mode></Target>\n")
+file(WRITE ${SCRATCH}/rate.xml "<Target name=\"T\"><Rate>41</Rate><Mode name=\"M\">"
+     "<SupportedValues>a,b</SupportedValues><MemoryLatency>4</MemoryLatency></Mode></Target>\n")
+file(WRITE ${SCRATCH}/few.xml "<Target name=\"T\"><Rate>40</Rate><Mode name=\"M\">"
+     "<SupportedValues>a</SupportedValues><MemoryLatency>4</MemoryLatency></Mode></Target>\n")
+file(WRITE ${SCRATCH}/bare.xml "<Target name=\"T\"><Rate>40</Rate></Target>\n")
+foreach(case "0;need;match" "2;more;/Extra: only the offered description holds this entry; offered \"yes\""
+        "1;slow;/M/MemoryLatency: the offered latency is larger than the required one; required \"4\", offered \"9\""
+        "1;rate;/Rate: the texts differ; required \"40\", offered \"41\""
+        "1;few;/M/SupportedValues: the offered list lacks a required value \"b\"; required \"a,b\", offered \"a\""
+        "1;bare;/M: the offered description lacks this entry")
+  list(GET case 0 answer)
+  list(GET case 1 offered)
+  list(GET case 2 reason)
+  run_wbhost(${answer} compare ${SCRATCH}/need.xml ${SCRATCH}/${offered}.xml)
+  set(plain "${OUT}")
+  run_wbhost(${answer} compare --explain ${SCRATCH}/need.xml ${SCRATCH}/${offered}.xml)
+  string(FIND "${OUT}" "${plain}" first)
+  if(NOT first EQUAL 0)
+    message(FATAL_ERROR "--explain answers \"${plain}\" first:\n${OUT}")
+  endif()
+  string(REGEX MATCHALL "\n  /" lines "${OUT}")
+  list(LENGTH lines count)
+  if(answer EQUAL 0 AND NOT count EQUAL 0 OR answer EQUAL 1 AND NOT count EQUAL 1)
+    message(FATAL_ERROR "a match explains nothing, a shortfall is one line:\n${OUT}")
+  endif()
+  expect_all("${OUT}" "${reason}")
+endforeach()
+# A tolerated difference lists every entry that made it so, in walk order.
+run_wbhost(2 compare --explain ${SCRATCH}/need.xml ${SCRATCH}/more.xml)
+expect_all("${OUT}" "tolerated difference\n  /Extra: only the offered description holds this entry; offered \"yes\"\n"
+           "  /M/MemoryLatency: the offered latency is smaller than the required one; required \"4\", offered \"3\"\n"
+           "  /M/SupportedValues: the offered list has a different number of values, every required one among them; required \"a,b\", offered \"b,A,c\"\n")
+run_wbhost(0 compare --explain --host-dir ${SCRATCH}/host ${SCRATCH}/inline.xml ${SCRATCH}/board.xml)
+run_wbhost(1 compare --explain ${SCRATCH}/inline.xml ${SCRATCH}/board.xml)
+run_wbhost(1 compare --explain ${EXAMPLES}/KestrelK40.xml ${EXAMPLES}/KestrelK20.xml)
+expect_all("${OUT}" "not satisfied\n  /Connector0/DIO4: the offered description lacks this entry\n")
+
 # Only regular files, each refused with its reason before a byte is read: a FIFO would block,
 # /dev/zero never end, a folder read as an empty description.
 execute_process(COMMAND mkfifo ${SCRATCH}/fifo RESULT_VARIABLE made)
@@ -87,6 +131,7 @@ file(WRITE ${SCRATCH}/nihon.xml "<Target name=\"T\"><DisplayName>日本</Display
 file(WRITE ${SCRATCH}/chuugoku.xml "<Target name=\"T\"><DisplayName>中国</DisplayName></Target>\n")
 run_wbhost(3 compare ${SCRATCH}/nihon.xml ${SCRATCH}/chuugoku.xml)
 expect_all("${ERR}" "cannot represent U+65E5 '日', U+672C '本'")
+run_wbhost(3 compare --explain ${SCRATCH}/nihon.xml ${SCRATCH}/chuugoku.xml)
 run_wbhost(0 tree ${SCRATCH}/nihon.xml)
 expect_all("${ERR}" "warning: " "U+65E5 '日', U+672C '本'")
 

@@ -1,6 +1,7 @@
 // The work behind wbhost's subcommands.
 #include "cli/Commands.h"
 
+#include "cli/CompareReport.h"
 #include "cli/ExitStatus.h"
 #include "cli/HostOptions.h"
 #include "cli/HostText.h"
@@ -10,6 +11,7 @@
 #include "kern/CodePage.h"
 #include "project/HexStatus.h"
 #include "resource_tree/ResTreeWriter.h"
+#include "resource_tree/ResourceCompare.h"
 #include "resources/InputFile.h"
 #include "resources/ResourceService.h"
 
@@ -155,26 +157,29 @@ int RunTreeCheck(const std::vector<std::string>& files, bool context, std::ostre
 }
 
 int RunCompare(const std::string& modulePath, const std::string& required,
-               const std::string& offered, std::ostream& out, std::ostream& err) {
-    const HostedModule module(modulePath);
-    auto* const compare = FindExport<CompareFn>(module, "TIO_CompareTwoResourceTrees", err);
-    if (compare == nullptr)
-        return kExitCannotRun;
+               const std::string& offered, bool explain, std::ostream& out, std::ostream& err) {
     const auto first = ReadDescriptionForModule(required, err);
     const auto second = first ? ReadDescriptionForModule(offered, err) : std::nullopt;
     if (!first || !second)
         return kExitCannotRun;
-    switch (compare(first->c_str(), second->c_str())) {
-    case 0:
-        out << "match\n";
-        return kExitOk;
-    case 2:
-        out << "tolerated difference\n";
-        return kExitTolerated;
-    default:
-        out << "not satisfied\n";
-        return kExitFailed;
+    uint32_t answer = 0;
+    wbhw::CompareExplanation why;
+    if (explain) {
+        // The module's export answers with a number only. The host carries the same comparison
+        // (built from the same sources); one walk of it gives the answer and what decided it,
+        // so the two cannot disagree.
+        answer = wbhw::CompareResourceTexts(*first, *second, &why);
+    } else {
+        const HostedModule module(modulePath);
+        auto* const compare = FindExport<CompareFn>(module, "TIO_CompareTwoResourceTrees", err);
+        if (compare == nullptr)
+            return kExitCannotRun;
+        answer = compare(first->c_str(), second->c_str());
     }
+    out << AnswerText(answer) << "\n";
+    if (explain)
+        WriteExplanation(why, out);
+    return AnswerStatus(answer);
 }
 
 int RunVersion(const std::string& version, const std::string& modulePath, std::ostream& out,

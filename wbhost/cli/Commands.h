@@ -30,9 +30,11 @@ int RunTreeCheck(const std::vector<std::string>& files, bool context, std::ostre
 // module that does not load is told on ERR and answers kExitCannotRun, as does a description
 // holding characters the host's code page cannot represent: the module is handed its texts in
 // that code page and would compare what it lost. A file is read as the loader reads one (a
-// UTF-16 file with a byte-order mark is the same description as its UTF-8 twin).
+// UTF-16 file with a byte-order mark is the same description as its UTF-8 twin). With EXPLAIN,
+// the answer comes from the host's own copy of the comparison, whose walk also records what
+// decided it; that follows the answer on OUT (CompareReport.h).
 int RunCompare(const std::string& modulePath, const std::string& required,
-               const std::string& offered, std::ostream& out, std::ostream& err);
+               const std::string& offered, bool explain, std::ostream& out, std::ostream& err);
 
 // Writes to OUT the host's VERSION, the module file at MODULEPATH and what its GetInfo answers.
 // A module that does not load, or has no GetInfo, is told on ERR and answers kExitFailed.

@@ -174,7 +174,7 @@ void PlayDescriptions(Transcript& script, const HostOptions& options, const std:
                     "compare " + file("KestrelK40.xml") + " " + file(each.offered),
                     {each.answer, {each.text}, {}}, [&](std::ostream& out, std::ostream& err) {
                         return RunCompare(options.modulePath, file("KestrelK40.xml"),
-                                          file(each.offered), out, err);
+                                          file(each.offered), false, out, err);
                     });
     }
 }
