@@ -9,6 +9,7 @@
 #include <memory>
 #include <new>
 #include <unicode/ucnv.h>
+#include <unicode/ucnv_cb.h>
 #include <utility>
 #include <vector>
 
@@ -40,6 +41,18 @@ bool IsConfiguredName(std::string_view codePage) {
     return codePage.empty() && configured != nullptr && *configured != '\0';
 }
 
+// Writes the substitute for every character the page lacks. ICU's own substitution drops the
+// default-ignorable ones (format controls such as U+200B or U+202C) without a trace, so a text
+// would lose characters where a "?" shows that something was there.
+void SubstituteEveryLackingCharacter(const void*, UConverterFromUnicodeArgs* args, const UChar*,
+                                     int32_t, UChar32, UConverterCallbackReason reason,
+                                     UErrorCode* status) {
+    if (reason > UCNV_IRREGULAR)
+        return; // reset, close and clone need nothing
+    *status = U_ZERO_ERROR;
+    ucnv_cbFromUWriteSub(args, 0, status);
+}
+
 ConverterPtr OpenConverter(const std::string& name, bool configured) {
     UErrorCode status = U_ZERO_ERROR;
     ConverterPtr converter(ucnv_open(name.c_str(), &status));
@@ -53,6 +66,10 @@ ConverterPtr OpenConverter(const std::string& name, bool configured) {
     // Windows writes "?" for characters a code page lacks; ICU's default would be SUB (0x1A).
     status = U_ZERO_ERROR;
     ucnv_setSubstChars(converter.get(), "?", 1, &status);
+    ucnv_setFromUCallBack(converter.get(), SubstituteEveryLackingCharacter, nullptr, nullptr,
+                          nullptr, &status);
+    if (U_FAILURE(status))
+        RaiseConversionFailure(status);
     return converter;
 }
 

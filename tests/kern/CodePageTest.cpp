@@ -50,6 +50,9 @@ TEST(CodePage, CharactersThePageLacksBecomeQuestionMarks) {
     EXPECT_EQ(WideToAnsi(u"a\u65E5b"), "a?b");
     // An unpaired surrogate is not a character of any page.
     EXPECT_EQ(WideToAnsi(std::u16string(u"a") + char16_t(0xD800) + u"b"), "a?b");
+    // Invisible format characters too: a name must not lose them without a trace.
+    EXPECT_EQ(WideToAnsi(u"a\u200Bb\u202C", "US-ASCII"), "a?b?");
+    EXPECT_EQ(WideToAnsi(u"a\u200Bb", "cp932"), "a?b");
 }
 
 TEST(CodePage, EnvironmentChoosesTheDefault) {
