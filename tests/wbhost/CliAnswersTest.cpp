@@ -23,7 +23,8 @@ TEST(CliAnswers, RefusesMisspeltBehavioursAndMalformedTextsWithoutSettingAnythin
     // Terminals run from 0 to 15: an answer for output 200 would be printed and never read.
     for (const char* bad : {"select-resource", "select-resource:0", ":0=1", "select-resource:x=1",
                             "select-resource:0=maybe", "select-resource:0=", "select-resource:16=1",
-                            "select-resource:200=1"}) {
+                            "select-resource:200=1", "select-resource:0=text:\xFF\xFE",
+                            "select-resource:0=list:a|b\xC3"}) {
         error.clear();
         EXPECT_FALSE(AddAnswer(bad, session, error)) << bad;
         EXPECT_FALSE(error.empty()) << bad;
@@ -33,6 +34,10 @@ TEST(CliAnswers, RefusesMisspeltBehavioursAndMalformedTextsWithoutSettingAnythin
     ASSERT_TRUE(AddAnswer("new-item-wizard:3=list:a|b", session, error)) << error;
     EXPECT_EQ(session.AnswersFor("new-item-wizard").at(3),
               ProgramValue(std::vector<std::u16string>{u"a", u"b"}));
+    // Terminal text is standard UTF-8, four-byte sequences included.
+    ASSERT_TRUE(AddAnswer("new-item-wizard:4=text:\xF0\x9F\x98\x80", session, error)) << error;
+    EXPECT_EQ(session.AnswersFor("new-item-wizard").at(4),
+              ProgramValue(std::u16string(u"\U0001F600")));
 }
 
 TEST(CliAnswers, FilesSkipCommentsAndBlanksAndNameTheBadLine) {

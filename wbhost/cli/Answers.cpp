@@ -54,7 +54,7 @@ std::string SetAnswer(std::string_view text, runner::ProgramSession& session) {
         return "no program behaviour has that name";
     if (!session.SetAnswerFromText(text))
         return "the index must be a terminal number (0 to 15) and the value a 32-bit number, "
-               "text:... or list:a|b";
+               "text:... or list:a|b in UTF-8";
     return {};
 }
 

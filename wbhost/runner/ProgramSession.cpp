@@ -1,24 +1,43 @@
 // The program session's answers and run log.
 #include "runner/ProgramSession.h"
 
-#include "kern/Utf8.h"
-
 #include <charconv>
+#include <unicode/ustring.h>
 
 namespace wbhost::runner {
 
 namespace {
 
+// TEXT decoded as the terminal gives it (standard UTF-8, characters beyond the BMP included);
+// nullopt when it is not well-formed UTF-8.
+std::optional<std::u16string> DecodeUtf8(std::string_view text) {
+    std::u16string wide(text.size(), u'\0');
+    int32_t length = 0;
+    UErrorCode status = U_ZERO_ERROR;
+    u_strFromUTF8(wide.data(), static_cast<int32_t>(wide.size()), &length, text.data(),
+                  static_cast<int32_t>(text.size()), &status);
+    if (U_FAILURE(status)) {
+        return std::nullopt;
+    }
+    wide.resize(static_cast<size_t>(length));
+    return wide;
+}
+
 std::optional<ProgramValue> ParseValue(std::string_view text) {
     if (text.starts_with("text:")) {
-        return ProgramValue(qv::kern::Utf8ToWide(std::string(text.substr(5))));
+        auto decoded = DecodeUtf8(text.substr(5));
+        return decoded ? std::optional<ProgramValue>(std::move(*decoded)) : std::nullopt;
     }
     if (text.starts_with("list:")) {
         std::vector<std::u16string> items;
         text.remove_prefix(5);
         while (!text.empty()) {
             const size_t bar = text.find('|');
-            items.push_back(qv::kern::Utf8ToWide(std::string(text.substr(0, bar))));
+            auto item = DecodeUtf8(text.substr(0, bar));
+            if (!item) {
+                return std::nullopt;
+            }
+            items.push_back(std::move(*item));
             text = bar == std::string_view::npos ? std::string_view{} : text.substr(bar + 1);
         }
         return ProgramValue(std::move(items));
