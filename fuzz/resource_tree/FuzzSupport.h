@@ -1,9 +1,10 @@
-// What the resource-tree fuzz targets share: turning bytes into a document, bounded settings and
-// a scratch directory with a few files to include.
+// What the resource-tree fuzz targets share: turning bytes into a document, the settings of a load
+// and a scratch directory with a few files to include.
 #pragma once
 
 #include "resource_tree/LoaderSettings.h"
 #include "resource_tree/LoaderText.h"
+#include "resource_tree/ResTreeNode.h"
 
 #include <cstdint>
 #include <cstdlib>
@@ -51,17 +52,51 @@ inline const std::string& ScratchDirectory() {
     return directory;
 }
 
-// Settings small enough that no input can make a load outgrow the fuzzer's memory.
-inline LoaderSettings FuzzSettings() {
+// Whether the input asks for the production limits: bit 1 of the first byte (DocumentFromBytes
+// reads bit 0). Small limits keep most runs quick, so the fuzzer explores more documents; the
+// production ones are what a hostile description meets, so the budget's own stops are reached.
+inline bool WantsProductionLimits(const uint8_t* data, size_t size) {
+    return size != 0 && (data[0] & 2) != 0;
+}
+
+// The settings of a fuzzed load: the production limits, or ones small enough that a run stays
+// in the millisecond range.
+inline LoaderSettings FuzzSettings(bool production) {
     LoaderSettings settings;
     settings.language = u"deu";
     settings.includeDirectory = ScratchDirectory();
     settings.deferredDirectory = ScratchDirectory();
+    if (production)
+        return settings;
     settings.maxNames = 2000;
     settings.maxEntries = 200000;
     settings.maxElementDepth = 200;
     settings.maxNestedLoads = 8;
     return settings;
+}
+
+// Entries of NODE and every node below it, counted up to just past LIMIT.
+inline size_t CountEntries(const ResTreeNode& node, size_t limit) {
+    size_t count = 0;
+    for (ResTreePosition at = node.Begin(); at != node.End() && count <= limit; ++at) {
+        ++count;
+        if (at->Kind() == EntryKind::Child && at->Child() != nullptr)
+            count += CountEntries(*at->Child(), limit - count + 1);
+    }
+    return count;
+}
+
+// Trees larger than this are checked by their size only: walking or writing a tree of a million
+// entries under the sanitizers takes minutes, and shows nothing a smaller tree does not.
+inline constexpr size_t kLargestWalkedTree = 20000;
+
+// Aborts when a load made more entries than its budget allows (the root's own and the message
+// entry may come on top).
+inline size_t CheckWithinBudget(const ResTreeNode& root, const LoaderSettings& settings) {
+    const size_t count = CountEntries(root, settings.maxEntries + 2);
+    if (count > settings.maxEntries + 2)
+        std::abort();
+    return count;
 }
 
 } // namespace wbhw::fuzz

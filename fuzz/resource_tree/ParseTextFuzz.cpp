@@ -32,7 +32,8 @@ void Walk(wbhw::ResTreeNode& node, int depth) {
 
 extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
     const std::u16string text = wbhw::fuzz::DocumentFromBytes(data, size);
-    const wbhw::LoaderSettings settings = wbhw::fuzz::FuzzSettings();
+    const wbhw::LoaderSettings settings =
+        wbhw::fuzz::FuzzSettings(wbhw::fuzz::WantsProductionLimits(data, size));
     wbhw::ResTreeNode root(wbhw::WString(), wbhw::WString(), false);
     wbhw::ResTreeNode* out = nullptr;
     const int32_t result = root.ParseText(text, (size & 2) != 0, &out, &settings);
@@ -40,6 +41,8 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
         std::abort();
     if (result != 0 && out != nullptr)
         std::abort();
+    if (wbhw::fuzz::CheckWithinBudget(root, settings) > wbhw::fuzz::kLargestWalkedTree)
+        return 0;
     Walk(root, 0);
     wbhw::WriteResTree(root, u"deu");
     return 0;

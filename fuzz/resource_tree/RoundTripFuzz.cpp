@@ -11,12 +11,15 @@
 
 extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
     const std::u16string text = wbhw::fuzz::DocumentFromBytes(data, size);
-    wbhw::LoaderSettings settings = wbhw::fuzz::FuzzSettings();
+    wbhw::LoaderSettings settings =
+        wbhw::fuzz::FuzzSettings(wbhw::fuzz::WantsProductionLimits(data, size));
     // Files would load differently the second time (deferred entries are used up).
     settings.includeDirectory = "/nonexistent";
     settings.deferredDirectory = "/nonexistent";
     wbhw::ResTreeNode first(wbhw::WString(), wbhw::WString(), false);
     first.ParseText(text, false, nullptr, &settings);
+    if (wbhw::fuzz::CheckWithinBudget(first, settings) > wbhw::fuzz::kLargestWalkedTree)
+        return 0;
     const wbhw::ResTreeDocument written = wbhw::WriteResTree(first, settings.language);
     if (!written.faithful)
         return 0;
