@@ -64,3 +64,24 @@ HRESULT CqxProjectItemUI::GetOverlays(uint32_t* count, BSTR** images) {
 HRESULT CqxProjectItemUI::QueryCanRemove() {
     return S_OK;
 }
+
+HRESULT CqxProjectItemUI::GetProjectItem(IwbProjectItem** item) {
+    if (!item) {
+        return E_POINTER;
+    }
+    *item = HostItem();
+    if (!*item) {
+        return S_FALSE;
+    }
+    (*item)->AddRef();
+    return S_OK;
+}
+
+HRESULT CqxProjectItemUI::GetProjectItemUI(IqxProjectItemUI** itemUI) {
+    if (!itemUI) {
+        return E_POINTER;
+    }
+    *itemUI = this;
+    (*itemUI)->AddRef();
+    return S_OK;
+}

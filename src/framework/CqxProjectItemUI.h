@@ -3,6 +3,7 @@
 #pragma once
 
 #include "framework/CqxItemUI.h"
+#include "framework/IqxItem.h"
 #include "framework/IqxProjectItemUI.h"
 
 // One overlay change an item hands the framework: show IMAGE (add) or take it away.
@@ -11,9 +12,9 @@ struct CqxOverlayRecord {
     bool add = false;
 };
 
-class CqxProjectItemUI : public CqxItemUI, public IqxProjectItemUI {
+class CqxProjectItemUI : public CqxItemUI, public IqxProjectItemUI, public IqxItem {
 public:
-    using Interfaces = CqxItemUI::Interfaces::Append<IqxProjectItemUI>;
+    using Interfaces = CqxItemUI::Interfaces::Append<IqxProjectItemUI, IqxItem>;
 
     // Rejects a null name and names holding one of the invalid name characters.
     HRESULT ValidateNewName(const char16_t* name) override;
@@ -24,6 +25,10 @@ public:
     HRESULT GetOverlays(uint32_t* count, BSTR** images) override;
     // The base lets every item be removed.
     HRESULT QueryCanRemove() override;
+    // The host item given to Bind.
+    HRESULT GetProjectItem(IwbProjectItem** item) override;
+    // IqxItem: the item is its own project-tree side.
+    HRESULT GetProjectItemUI(IqxProjectItemUI** itemUI) override;
 
 protected:
     CqxProjectItemUI() = default;

@@ -4,6 +4,8 @@
 #include "com/Bstr.h"
 #include "com/IUnknown.h"
 
+struct IwbProjectItem;
+
 struct IqxProjectItemUI : IUnknown {
     static constexpr IID iid = qv::com::ParseGuid("CCAC84A4-B4CE-452A-8286-89E841C04F8D");
 
@@ -17,4 +19,7 @@ struct IqxProjectItemUI : IUnknown {
     virtual HRESULT GetOverlays(uint32_t* count, BSTR** images) = 0;
     // S_OK when the item may be removed (or cut), S_FALSE when it may not.
     virtual HRESULT QueryCanRemove() = 0;
+    // The host project item the object stands for, with a reference; 1 and null while it is not
+    // bound to one. Null ITEM gives E_POINTER.
+    virtual HRESULT GetProjectItem(IwbProjectItem** item) = 0;
 };

@@ -2,7 +2,7 @@
 #include "ProjectTestSupport.h"
 #include "host/contracts/IwbProjectItemUIMap.h"
 #include "host/contracts/IwbhwResourceTreeNode.h"
-#include "project/FolderObject.h"
+#include "project/HostItemObject.h"
 #include "project/Project.h"
 
 #include <gtest/gtest.h>

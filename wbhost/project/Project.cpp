@@ -6,8 +6,8 @@
 #include "kern/Guid.h"
 #include "kern/Utf8.h"
 #include "project/AtomicFile.h"
-#include "project/FolderObject.h"
 #include "project/HexStatus.h"
+#include "project/HostItemObject.h"
 #include "project/ItemUIMap.h"
 
 #include <algorithm>
@@ -108,7 +108,7 @@ HRESULT Project::AttachTarget(ProjectItem& item, const std::string& description,
         return E_FAIL;
     }
     TargetObjectInstance* made = nullptr;
-    if (FAILED(TargetObjectInstance::CreateInstance(&made, target)))
+    if (FAILED(TargetObjectInstance::CreateInstance(&made, &item, target)))
         throw std::bad_alloc();
     auto object = ComPtr<TargetObjectInstance>::Adopt(made);
     item.SetObject(ComPtr<IUnknown>::Share(object->GetUnknown()));

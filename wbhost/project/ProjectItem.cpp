@@ -7,7 +7,7 @@
 #include "host/contracts/IwbProjectItemUIMap.h"
 #include "kern/Collate.h"
 #include "kern/Guid.h"
-#include "project/FolderObject.h"
+#include "project/HostItemObject.h"
 #include "project/Project.h"
 
 #include <algorithm>
@@ -220,7 +220,7 @@ void ProjectItem::Close() {
     // objects do not hold it, so they are told it is gone.
     ComPtr<IUnknown> object = std::move(object_);
     if (const auto own = qv::com::QueryAs<IwbHostItemObject>(object.Get()))
-        static_cast<FolderObject*>(own.Get())->Forget();
+        static_cast<HostItemObject*>(own.Get())->Forget();
     object.Reset();
     std::vector<ComPtr<ProjectItem>> children = std::move(children_);
     children_.clear();

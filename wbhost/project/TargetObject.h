@@ -7,6 +7,7 @@
 #include "host/contracts/IwbTargetItemChange.h"
 #include "host/contracts/IwbhwResourceTreeProvider.h"
 #include "host/contracts/IwbhwTargetResources.h"
+#include "project/HostItemObject.h"
 #include "resources/ResourceService.h"
 
 #include <vector>
@@ -14,15 +15,19 @@
 namespace wbhost::project {
 
 // A target is a name scope: I/O item names need only be unique below it.
-class TargetObject : public IwbTargetItemChange,
+class TargetObject : public HostItemObject,
+                     public IwbTargetItemChange,
                      public IwbhwResourceTreeProvider,
                      public IwbhwTargetResources,
                      public IwbProjectItemScope {
 public:
-    using Interfaces = qv::com::InterfaceList<IwbTargetItemChange, IwbhwResourceTreeProvider,
-                                              IwbhwTargetResources, IwbProjectItemScope>;
-    // The object of TARGET (kept alive by the service, which outlives the project).
-    explicit TargetObject(resources::Target* target) : target_(target) {}
+    using Interfaces =
+        HostItemObject::Interfaces::Append<IwbTargetItemChange, IwbhwResourceTreeProvider,
+                                           IwbhwTargetResources, IwbProjectItemScope>;
+    // The object of ITEM, which owns TARGET (kept alive by the service, which outlives the
+    // project).
+    TargetObject(IwbProjectItem* item, resources::Target* target)
+        : HostItemObject(item), target_(target) {}
     virtual ~TargetObject() = default;
 
     // Records ITEM (E_POINTER when null); while suspended, the change is only counted.
