@@ -44,6 +44,9 @@ public:
     int32_t resourceStatus() const { return resourceStatus_; }
     // The item's attribute bag; null until the item is loaded.
     const TIOAttrBag* attributeBag() const { return attrBag_.get(); }
+    // Gives a newly created item its attribute bag: stores TEXT (attribute-bag XML) in
+    // "tioAttrBag" and loads the item from it, binding it to the resource it names.
+    HRESULT LoadCreatedBag(std::u16string_view text);
 
     // IqxItemUI / IqxBindable / IqxProjectItemUI
     HRESULT Bind(IwbProjectItem* item) override;
