@@ -168,10 +168,31 @@ void AddProject(CLI::App& app, Request& request) {
     add->add_option("--resource", item->resource, "the resource's path in the target's tree")
         ->required();
     add->add_option("--name", item->name,
-                    "the item's name, after folders separated by / (default: the resource's)");
+                    "the item's name, after folders separated by / (\\/ keeps a / in a name; "
+                    "default: the resource's)");
+    add->add_option("--attribute", item->attributes, "a further attribute of the item")
+        ->type_name("ATTRIBUTE=VALUE")
+        ->allow_extra_args(false);
     add->callback([&request, path, item] {
         request.run = [&request, path, item] {
             return wbhost::cli::RunAddItem(request.host, *path, *item, std::cout, std::cerr);
+        };
+    });
+
+    auto* bulk = project->add_subcommand(
+        "add-items", "add many Tangent I/O items to a target in one bulk creation by the module "
+                     "(TIO_CreateMultiple), and save");
+    bulk->footer("FILE has one item a line: NAME<TAB>RESOURCE, optionally followed by "
+                 "<TAB>ATTRIBUTE=VALUE pairs; a line starting with # is a comment. Every line is "
+                 "checked before anything is created.");
+    auto bulkRequest = std::make_shared<std::pair<std::string, std::string>>();
+    bulk->add_option("PROJECT", *path, "the project file")->required();
+    bulk->add_option("--target", bulkRequest->first, "the target's name")->required();
+    bulk->add_option("FILE", bulkRequest->second, "the item list")->required();
+    bulk->callback([&request, path, bulkRequest] {
+        request.run = [&request, path, bulkRequest] {
+            return wbhost::cli::RunAddItems(request.host, *path, bulkRequest->first,
+                                            bulkRequest->second, std::cout, std::cerr);
         };
     });
 

@@ -1,14 +1,19 @@
 // A target with N resources under one connector and a project with one Tangent I/O item for
 // each, driven through the embedded host and the real module: opening the project (every item
-// made and bound) and renaming the connector (every item follows). Reports the processor time
+// made and bound), renaming the connector (every item follows) and creating the items in one
+// bulk call of TIO_CreateMultiple, as a host program does. Reports the processor time
 // per item and, for 10,000 items, its ratio to the same figure at 1,000 items measured in the
 // same run (near 1 when no walk is quadratic), and the notifications one rename delivers.
 #include "cli/AttributeSet.h"
+#include "cli/HostStringList.h"
+#include "cli/HostText.h"
+#include "cli/HostedModule.h"
 #include "cli/ItemStates.h"
 #include "kern/IntegerText.h"
 #include "project/AtomicFile.h"
 #include "project/ProjectFormat.h"
 #include "provider/TIOIdentifiers.h"
+#include "runtime/RefnumTable.h"
 #include "session/HostSession.h"
 
 #include <algorithm>
@@ -273,9 +278,63 @@ void BM_RenameConnector(benchmark::State& state) {
     state.counters["items_following_10000"] = large.Following();
 }
 
+// COUNT definitions, one item for each line of the scale target, in the host's code page.
+std::vector<std::string> Definitions(int count) {
+    std::vector<std::string> texts;
+    for (int i = 0; i < count; ++i) {
+        const std::u16string number = qv::kern::IntegerToString(static_cast<uint32_t>(i), 10);
+        texts.push_back(wbhost::cli::ToHostText(wbhost::cli::ToUtf8(
+            wbhost::cli::NewItemAttributeSet(u"Item" + number, u"/C0/L" + number))));
+    }
+    return texts;
+}
+
+// Creates an item for each of the COUNT lines of a new project's target in one call of
+// TIO_CreateMultiple; the processor seconds of the call, or a negative number when it failed.
+// BOUND receives how many items came out bound.
+double CreateMultiple(int count, double* bound) {
+    auto session = OpenScaleProject(count, false, nullptr);
+    using CreateMultipleFn = int32_t(const WBRefNum*, WBHandle*);
+    auto* create =
+        session ? session->Module()->Find<CreateMultipleFn>("TIO_CreateMultiple") : nullptr;
+    if (create == nullptr)
+        return -1;
+    wbhost::cli::HostStringList definitions(Definitions(count));
+    auto& refnums = wbhost::runtime::RefnumTable::Instance();
+    const WBRefNum refnum = refnums.Add(TargetOf(*session).Object());
+    const double start = ThreadSeconds();
+    const int32_t status = create(&refnum, &definitions.Handle());
+    const double seconds = ThreadSeconds() - start;
+    refnums.Remove(refnum);
+    *bound += ItemsWith(*session, 0, u"/C0/");
+    return status == S_OK ? seconds : -1;
+}
+
+void BM_CreateMultiple(benchmark::State& state) {
+    Pairs& pairs = g_pairs["create in one call"];
+    double bound = 0;
+    for (auto _ : state) {
+        state.PauseTiming();
+        double seconds[2] = {0, 0};
+        const bool smallFirst = state.iterations() % 2 == 0;
+        for (const int count : {smallFirst ? kSmall : kLarge, smallFirst ? kLarge : kSmall}) {
+            seconds[count == kLarge] = CreateMultiple(count, &bound);
+            if (seconds[count == kLarge] < 0) {
+                state.SkipWithError("the items cannot be created");
+                return;
+            }
+        }
+        pairs.Add(seconds[0], seconds[1]);
+        state.ResumeTiming();
+    }
+    pairs.Report(state);
+    state.counters["items_bound_per_pair"] = bound / static_cast<double>(state.iterations());
+}
+
 // Few iterations, each long; the medians of the pairs are what the summary compares.
 BENCHMARK(BM_OpenAndBind)->Unit(benchmark::kMillisecond)->Iterations(6);
 BENCHMARK(BM_RenameConnector)->Arg(0)->Arg(1)->Unit(benchmark::kMillisecond)->Iterations(10);
+BENCHMARK(BM_CreateMultiple)->Unit(benchmark::kMillisecond)->Iterations(6);
 
 } // namespace
 

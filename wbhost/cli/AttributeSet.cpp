@@ -6,6 +6,8 @@
 #include "resource_tree/ExPatHandler.h"
 #include "resource_tree/XmlEscape.h"
 
+#include <algorithm>
+
 namespace wbhost::cli {
 namespace {
 
@@ -82,11 +84,18 @@ private:
 
 } // namespace
 
-std::u16string NewItemAttributeSet(std::u16string_view name, std::u16string_view resource) {
-    std::u16string text = u"<AttributeSet name=\"\">\n";
+std::u16string NewItemAttributeSet(std::u16string_view name, std::u16string_view resource,
+                                   const std::vector<SetAttribute>& more) {
+    std::vector<SetAttribute> all = more;
+    all.emplace_back(u"name", name);
+    all.emplace_back(u"resource", resource);
     // Written in name order, as the module writes its own sets.
-    AppendAttribute(u"name", name, text);
-    AppendAttribute(u"resource", resource, text);
+    std::stable_sort(all.begin(), all.end(), [](const SetAttribute& a, const SetAttribute& b) {
+        return qv::kern::LessNoCase()(a.first, b.first);
+    });
+    std::u16string text = u"<AttributeSet name=\"\">\n";
+    for (const auto& [attribute, value] : all)
+        AppendAttribute(attribute, value, text);
     return text + u"</AttributeSet>\n";
 }
 

@@ -193,7 +193,7 @@ void PlayProject(Transcript& script, const HostOptions& options, const std::stri
         std::string command = "project add-item " + project + " --target " + item.target +
                               " --resource " + item.resource;
         if (!item.name.empty())
-            command += " --name " + item.name;
+            command += " --name '" + item.name + "'";
         script.Step(title, command, expect, [&](std::ostream& out, std::ostream& err) {
             return RunAddItem(options, project, item, out, err);
         });
@@ -212,6 +212,13 @@ void PlayProject(Transcript& script, const HostOptions& options, const std::stri
         "A second item on the line of \"Valve\": the first holds it, so this one is in conflict",
         {"K40", "Connector1/DIO3", "Backup"},
         {0, {"Tangent I/O item \"Backup\"", "tioResourceStatus: held by another item"}, {}});
+    addItem(
+        "Through the wizard, an item whose name keeps an escaped \"/\", in a new folder",
+        {"K40", "Connector0/DIO5", "Pumps/Inlet\\/Outlet"},
+        {0, {"through the wizard", "folder \"Pumps\"", "Tangent I/O item \"Inlet/Outlet\""}, {}});
+    addItem("A second item in that folder: the folder is reused",
+            {"K40", "Connector0/DIO6", "pumps/Drain"},
+            {0, {"Tangent I/O item \"Drain\"", "resource=/Connector0/DIO6"}, {"folder \"pumps\""}});
     addItem("A resource the board does not have", {"K40", "Connector0/DIO9", ""},
             {1, {"has no resource \"Connector0/DIO9\""}, {}});
     addItem("A name the target has already", {"K40", "Connector0/DIO0", "valve"},
@@ -315,6 +322,69 @@ void PlayEdits(Transcript& script, const HostOptions& options, const WorkFolder&
          {"RearConnector/DIO9/Label", "x"}, {1, {"nothing was set"}, {}});
 }
 
+// A rack of 4 slots of 32 digital lines, and a list of 100 items for it, as a person writes one.
+void WriteRack(const std::string& board, const std::string& list, const std::string& badList) {
+    std::ofstream rack(board, std::ios::binary);
+    rack << "<Target>\n  <TIOItemTypeName>Rack I/O</TIOItemTypeName>\n";
+    for (int slot = 0; slot < 4; ++slot) {
+        rack << "  <Connector name=\"Slot" << slot << "\">\n";
+        for (int line = 0; line < 32; ++line)
+            rack << "    <DigitalLine name=\"DIO" << line << "\"><Line>" << line
+                 << "</Line></DigitalLine>\n";
+        rack << "  </Connector>\n";
+    }
+    rack << "</Target>\n";
+    std::ofstream items(list, std::ios::binary);
+    items << "# NAME<TAB>RESOURCE[<TAB>ATTRIBUTE=VALUE]...\n";
+    for (int i = 0; i < 100; ++i)
+        items << "Slot" << i / 32 << "/Line" << i << "\tSlot" << i / 32 << "/DIO" << i % 32
+              << "\tColour=" << (i % 2 == 0 ? "green" : "red") << "\n";
+    std::ofstream(badList, std::ios::binary)
+        << "# the third line has no resource\nFirst\tSlot0/DIO0\nSecond\n";
+}
+
+void PlayBulkImport(Transcript& script, const HostOptions& options, const WorkFolder& work) {
+    const std::string board = work.File("rack.xml");
+    const std::string list = work.File("rack-items.txt");
+    const std::string badList = work.File("rack-bad.txt");
+    const std::string project = work.File("rack.wbproj");
+    WriteRack(board, list, badList);
+    script.Step("A project for a rack of 128 digital lines",
+                "project new " + project + " --target Rack=" + board,
+                {0, {"created", "target \"Rack\""}, {}}, [&](std::ostream& out, std::ostream& err) {
+                    return RunProjectNew(options, project, {"Rack=" + board}, true, out, err);
+                });
+    script.Step("A list whose third line is bad: refused with its line, nothing created",
+                "project add-items " + project + " --target Rack " + badList,
+                {1, {"rack-bad.txt:3:", "expected NAME<TAB>RESOURCE"}, {}},
+                [&](std::ostream& out, std::ostream& err) {
+                    return RunAddItems(options, project, "Rack", badList, out, err);
+                });
+    script.Step("Import 100 items from the list in one call of TIO_CreateMultiple",
+                "project add-items " + project + " --target Rack " + list,
+                {0, {"added 100 items to target \"Rack\" in one call"}, {}},
+                [&](std::ostream& out, std::ostream& err) {
+                    return RunAddItems(options, project, "Rack", list, out, err);
+                });
+    script.Step(
+        "Reopened, all 100 items are bound to their lines", "project list " + project + " --json",
+        {0, {"100 items, 100 bound"}, {}}, [&](std::ostream& out, std::ostream& err) {
+            std::ostringstream listing;
+            const int exit = RunProjectJson(options, project, listing, err);
+            const auto json = nlohmann::json::parse(listing.str(), nullptr, false);
+            size_t items = 0;
+            size_t bound = 0;
+            for (const auto& target : json.is_discarded() ? nlohmann::json() : json["targets"]) {
+                for (const auto& item : target["items"]) {
+                    ++items;
+                    bound += item["status"] == 0 ? 1 : 0;
+                }
+            }
+            out << items << " items, " << bound << " bound\n";
+            return exit;
+        });
+}
+
 void PlayPrograms(Transcript& script, const HostOptions& options) {
     script.Step("A unique name next to the names taken",
                 "program TIOGenUniqueName.gx --input 0=text:Valve --input \"1=list:Valve|Valve1\"",
@@ -360,6 +430,7 @@ int RunDemo(const HostOptions& options, const DemoSettings& settings, std::ostre
     PlayDescriptions(script, options, settings.examples);
     PlayProject(script, options, settings.examples, work);
     PlayEdits(script, options, work);
+    PlayBulkImport(script, options, work);
     PlayPrograms(script, options);
     if (script.Failures() != 0) {
         out << "demo: " << script.Failures() << " of " << script.Steps()

@@ -3,11 +3,13 @@
 
 #include "cli/AttributeSet.h"
 #include "cli/HostText.h"
+#include "cli/ItemList.h"
 #include "cli/ItemListing.h"
+#include "cli/NewItemChecks.h"
 #include "cli/ProjectJson.h"
 #include "kern/Collate.h"
 #include "project/HexStatus.h"
-#include "provider/TIOIdentifiers.h"
+#include "session/NewItemWizard.h"
 
 #include <filesystem>
 #include <ostream>
@@ -27,96 +29,15 @@ ProjectItem* ChildNamed(const ProjectItem& parent, std::u16string_view name) {
     return nullptr;
 }
 
-// NAME split at "/" into folder names and the item's name; empty when a part is empty.
-std::vector<std::u16string> SplitPlace(std::u16string_view name) {
-    std::vector<std::u16string> parts;
-    while (true) {
-        const size_t slash = name.find(u'/');
-        parts.emplace_back(name.substr(0, slash));
-        if (parts.back().empty())
-            return {};
-        if (slash == std::u16string_view::npos)
-            return parts;
-        name.remove_prefix(slash + 1);
-    }
-}
-
-// The folder FOLDERNAME below PARENT, made when absent; null, with the reason on ERR, when an
-// item of another type holds the name or the folder cannot be made.
-ProjectItem* FolderIn(ProjectItem& parent, const std::u16string& folderName, std::ostream& err) {
-    if (ProjectItem* existing = ChildNamed(parent, folderName)) {
-        if (IsEqualGUID(existing->Type(), wbproj::kFolderType))
-            return existing;
-        err << "wbhost: \"" << ToUtf8(folderName) << "\" below \"" << ToUtf8(parent.Name())
-            << "\" is a " << ItemTypeName(existing->Type()) << ", not a folder\n";
-        return nullptr;
-    }
-    if (const HRESULT made = parent.CreateChild(wbproj::kFolderType, folderName.c_str(), nullptr);
-        FAILED(made)) {
-        err << "wbhost: cannot make the folder \"" << ToUtf8(folderName) << "\" (status "
-            << HexStatus(made) << ")\n";
-        return nullptr;
-    }
-    return ChildNamed(parent, folderName);
-}
-
-// The Tangent I/O item called NAME anywhere below SCOPE, or null.
-const ProjectItem* IOItemNamed(const ProjectItem& scope, std::u16string_view name) {
-    for (const auto& child : scope.Children()) {
-        if (IsEqualGUID(child->Type(), tio::kIOItemType) &&
-            qv::kern::EqualsNoCase(child->Name(), name))
-            return child.Get();
-        if (const ProjectItem* below = IOItemNamed(*child.Get(), name))
-            return below;
-    }
-    return nullptr;
-}
-
-// Makes the Tangent I/O item NAME below PARENT with the attribute set BAG stored before its
-// object loads, as a new item arrives with its bag; null with the reason on ERR. I/O item names
-// are unique in their whole target (TARGET), folders or not.
-ProjectItem* NewIOItem(project::Project& project, ProjectItem& target, ProjectItem& parent,
-                       const std::u16string& name, const std::u16string& bag, std::ostream& err) {
-    if (ProjectItem* existing = ChildNamed(parent, name)) {
-        err << "wbhost: \"" << ToUtf8(parent.Name()) << "\" already has an item called \""
-            << ToUtf8(existing->Name()) << "\"\n";
-        return nullptr;
-    }
-    if (const ProjectItem* existing = IOItemNamed(target, name)) {
-        err << "wbhost: target \"" << ToUtf8(target.Name())
-            << "\" already has an I/O item called \"" << ToUtf8(existing->Name()) << "\"\n";
-        return nullptr;
-    }
-    project::Property text;
-    text.text = bag;
-    qv::com::ComPtr<ProjectItem> item;
-    if (const HRESULT made =
-            project.CreateItem(parent, tio::kIOItemType, name, {{u"tioAttrBag", text}}, &item);
-        FAILED(made)) {
-        err << "wbhost: the module's provider cannot make a Tangent I/O item now (status "
-            << HexStatus(made) << ")\n";
-        return nullptr;
-    }
-    if (item->Object() == nullptr) {
-        // A module that does not know the type leaves a bare item behind: not worth keeping.
-        parent.RemoveChild(item.Get());
-        err << "wbhost: the loaded module's provider does not make Tangent I/O items\n";
-        return nullptr;
-    }
-    return item.Get();
-}
-
-// The path of the resource node PATH names in TARGET's tree, as the tree writes it; empty when
-// there is no such node.
-std::u16string ResourceNodePath(project::Project& project, ProjectItem& target,
-                                std::u16string_view path) {
-    project::TargetObject* object = project.TargetOf(target);
-    if (object == nullptr)
-        return {};
-    resources::ResourceTree& tree = *object->Target().tree;
-    const std::lock_guard hold(tree.Mutex());
-    const wbhw::ResTreeNode* node = tree.Find(path);
-    return node != nullptr ? node->Path() : std::u16string();
+// Makes the wizard program answer TEXT as the one item to create, unless the session's answers
+// say otherwise already.
+void AnswerWizard(runner::ProgramSession& programs, std::u16string text) {
+    const std::string behaviour = "new-item-wizard";
+    const runner::Terminals given = programs.AnswersFor(behaviour);
+    if (given.find(0) == given.end())
+        programs.SetAnswer(behaviour, 0, int32_t{0});
+    if (given.find(3) == given.end())
+        programs.SetAnswer(behaviour, 3, std::vector<std::u16string>{std::move(text)});
 }
 
 bool SaveProject(session::HostSession& session, const std::string& path, std::ostream& err) {
@@ -205,10 +126,9 @@ int RunAddItem(const HostOptions& options, const std::string& projectPath,
     ProjectItem* target = FindTarget(project, request.target, err);
     if (target == nullptr)
         return kProjectFailed;
-    const std::u16string asked = FromUtf8(request.resource);
-    const std::u16string resource =
-        asked.empty() ? std::u16string() : ResourceNodePath(project, *target, asked);
-    if (resource.empty() || resource == u"/") {
+    // Resource paths are kept as the tree writes them, whatever spelling found the node.
+    const std::u16string resource = ResourceNodePath(project, *target, FromUtf8(request.resource));
+    if (resource.empty()) {
         err << "wbhost: target \"" << request.target << "\" has no resource \"" << request.resource
             << "\"\n";
         return kProjectFailed;
@@ -216,24 +136,46 @@ int RunAddItem(const HostOptions& options, const std::string& projectPath,
     const std::u16string place = request.name.empty()
                                      ? resource.substr(resource.find_last_of(u'/') + 1)
                                      : FromUtf8(request.name);
-    // Resource paths are kept as the tree writes them, whatever spelling found the node.
-    const std::vector<std::u16string> parts = SplitPlace(place);
+    const std::vector<std::u16string> parts = PlaceParts(place);
     if (parts.empty()) {
         err << "wbhost: \"" << ToUtf8(place) << "\" is no item name (empty name or folder)\n";
         return kProjectFailed;
     }
-    ProjectItem* parent = target;
-    for (size_t i = 0; i + 1 < parts.size() && parent != nullptr; ++i)
-        parent = FolderIn(*parent, parts[i], err);
-    ProjectItem* item = parent == nullptr ? nullptr
-                                          : NewIOItem(project, *target, *parent, parts.back(),
-                                                      NewItemAttributeSet(place, resource), err);
-    if (item == nullptr)
+    if (const std::string conflict = PlaceConflict(*target, parts, IOItemNames(*target));
+        !conflict.empty()) {
+        err << "wbhost: " << conflict << "\n";
         return kProjectFailed;
+    }
+    std::vector<SetAttribute> attributes;
+    for (const std::string& text : request.attributes) {
+        std::pair<std::string, std::string> attribute;
+        if (const auto why = SplitAttributeText(text, attribute)) {
+            err << "wbhost: " << *why << "\n";
+            return kProjectFailed;
+        }
+        attributes.emplace_back(FromUtf8(attribute.first), FromUtf8(attribute.second));
+    }
+    // The wizard program's answer, as a user filling it in would give it; answers given on the
+    // command line (a cancelled wizard, say) stand.
+    AnswerWizard(session.Programs(), NewItemAttributeSet(place, resource, attributes));
+    const session::WizardOutcome wizard = session::RunNewItemWizard(session, *target);
+    if (FAILED(wizard.status)) {
+        err << "wbhost: the module's wizard did not add \"" << ToUtf8(place) << "\" (status "
+            << HexStatus(wizard.status) << ")\n";
+        return kProjectFailed;
+    }
+    if (wizard.cancelled) {
+        out << "the wizard was cancelled: nothing was added\n";
+        FinishSession(options, session, out);
+        return kProjectOk;
+    }
     if (!SaveProject(session, projectPath, err))
         return kProjectFailed;
     out << "added \"" << ToUtf8(place) << "\" for " << request.resource << " to target \""
-        << ToUtf8(target->Name()) << "\"\n";
+        << ToUtf8(target->Name()) << "\" through the wizard";
+    if (!wizard.offered.empty())
+        out << " (" << ToUtf8(wizard.offered) << ")";
+    out << "\n";
     PrintItemTree(*target, out);
     FinishSession(options, session, out);
     return kProjectOk;
@@ -250,7 +192,7 @@ int RunRemoveItem(const HostOptions& options, const std::string& projectPath,
     if (target == nullptr)
         return kProjectFailed;
     ProjectItem* item = target;
-    for (const std::u16string& part : SplitPlace(FromUtf8(itemPath))) {
+    for (const std::u16string& part : PlaceParts(FromUtf8(itemPath))) {
         item = ChildNamed(*item, part);
         if (item == nullptr)
             break;
