@@ -41,11 +41,6 @@ constexpr const char* kBoard = R"(<Target>
 </Target>
 )";
 
-std::u16string Bag(std::u16string_view resource) {
-    return u"<AttributeSet name=\"\">\n<Attribute name=\"resource\">\n<Value>" +
-           std::u16string(resource) + u"</Value>\n</Attribute>\n</AttributeSet>\n";
-}
-
 std::string Cluster(std::string_view name, std::string_view value) {
     return "<Cluster><Name></Name><NumElts>2</NumElts><String><Name>name</Name><Val>" +
            std::string(name) + "</Val></String><String><Name>value</Name><Val>" +
@@ -83,7 +78,7 @@ protected:
     // A new item bound to RESOURCE and the refnum a host program would hold for it.
     WBRefNum AddItem(std::u16string name, std::u16string_view resource) {
         wbhost::project::PropertyBag::Map properties;
-        properties[u"tioAttrBag"] = Property{Property::Kind::String, Bag(resource), 0};
+        properties[u"tioAttrBag"] = Property{Property::Kind::String, ItemBag(resource), 0};
         ComPtr<ProjectItem> made;
         EXPECT_EQ(Project().CreateItem(*target.Get(), tio::kIOItemType, std::move(name), properties,
                                        &made),

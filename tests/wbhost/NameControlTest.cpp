@@ -2,6 +2,7 @@
 // control's programs through the runner, and the upgrade export running the host's library
 // program through the engine table this host exports.
 #include "ProjectTestSupport.h"
+#include "VariantText.h"
 #include "cli/HostedModule.h"
 #include "com/TaskMem.h"
 #include "host/contracts/IwbProjectNameProvider.h"
@@ -18,19 +19,10 @@ using qv::com::ComPtr;
 
 namespace {
 
-struct Name {
-    explicit Name(std::string_view text) : bytes(1, static_cast<unsigned char>(text.size())) {
-        bytes.insert(bytes.end(), text.begin(), text.end());
-    }
-    const unsigned char* get() const { return bytes.data(); }
-    std::basic_string<unsigned char> bytes;
-};
+using varianttext::Name;
 
 void SetText(WBVariant variant, std::string_view name, std::string_view text) {
-    WBHandle value = nullptr;
-    ASSERT_EQ(wbhost::runtime::StoreHostString(&value, text), kWBNoErr);
-    ASSERT_EQ(WbVariantPStrSetStringAttr(variant, Name(name).get(), value), kWBNoErr);
-    DSDisposeHandle(value);
+    ASSERT_EQ(varianttext::SetText(variant, name, text), kWBNoErr);
 }
 
 // A variant destroyed with its holder.

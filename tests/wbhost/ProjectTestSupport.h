@@ -84,6 +84,12 @@ template <class Impl, class... Args> qv::com::ComPtr<CQVComObject<Impl>> Make(Ar
     return qv::com::ComPtr<CQVComObject<Impl>>::Adopt(made);
 }
 
+// The attribute-set text a new I/O item is made with: its "resource" attribute is RESOURCE.
+inline std::u16string ItemBag(std::u16string_view resource) {
+    return u"<AttributeSet name=\"\">\n<Attribute name=\"resource\">\n<Value>" +
+           std::u16string(resource) + u"</Value>\n</Attribute>\n</AttributeSet>\n";
+}
+
 inline std::u16string NameOf(IwbProjectItem* item) {
     BSTR name = nullptr;
     item->GetName(&name);

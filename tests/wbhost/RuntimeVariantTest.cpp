@@ -1,6 +1,7 @@
 // Variant attributes as the I/O name control reads and writes them, and the host objects of the
 // runtime (target items).
 #include "TestObjects.h"
+#include "VariantText.h"
 #include "runtime/HostObjects.h"
 #include "runtime/HostStrings.h"
 #include "runtime/Runtime.h"
@@ -14,30 +15,9 @@ namespace {
 using wbhost::runtime::ReadHostString;
 using wbhost::runtime::StoreHostString;
 
-// A Pascal-string attribute name.
-struct Name {
-    explicit Name(std::string_view text) : bytes(1, static_cast<unsigned char>(text.size())) {
-        bytes.insert(bytes.end(), text.begin(), text.end());
-    }
-    const unsigned char* get() const { return bytes.data(); }
-    std::basic_string<unsigned char> bytes;
-};
-
-WBErr SetText(WBVariant variant, std::string_view name, std::string_view text) {
-    WBHandle value = nullptr;
-    EXPECT_EQ(StoreHostString(&value, text), kWBNoErr);
-    const WBErr err = WbVariantPStrSetStringAttr(variant, Name(name).get(), value);
-    DSDisposeHandle(value);
-    return err;
-}
-
-std::string GetText(WBVariant variant, std::string_view name, WBErr expected = kWBNoErr) {
-    WBHandle value = nullptr;
-    EXPECT_EQ(WbVariantPStrGetStringAttr(variant, Name(name).get(), &value), expected);
-    std::string text = ReadHostString(value).value_or("<none>");
-    DSDisposeHandle(value);
-    return text;
-}
+using varianttext::GetText;
+using varianttext::Name;
+using varianttext::SetText;
 
 TEST(RuntimeVariant, NestedAttributesReadAsCopiesOfTheirOwn) {
     const size_t live = wbhost::runtime::VariantTable::Instance().LiveCount();
