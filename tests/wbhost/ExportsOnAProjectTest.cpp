@@ -31,11 +31,12 @@ using ProtocolsFn = int32_t(const WBRefNum*, HS, WBHandle*, uint8_t*);
 using EditFn = int32_t(const WBRefNum*, HS, HS, uint8_t*);
 using SetAttributesFn = int32_t(const WBRefNum*, WBHandle*);
 using SetOnMultipleFn = int32_t(WBHandle*, WBHandle*);
+using GetResourceFn = int32_t(const WBRefNum*, void*, HS, HS, int32_t*);
 
 constexpr const char* kBoard = R"(<Target>
   <Connector name="C0">
     <Line name="DIO0"><Protocols>IOResource, Digital</Protocols><Speed>slow</Speed></Line>
-    <Line name="DIO1"><Protocols>IOResource</Protocols></Line>
+    <Line name="DIO1"><Protocols>IOResource</Protocols><NameDecoration>Front LED</NameDecoration></Line>
     <Line name="DIO2"/>
   </Connector>
 </Target>
@@ -253,9 +254,42 @@ TEST_F(ExportsOnAProject, AttributesReachOneItemOrOneTextEachOfSeveral) {
     EXPECT_EQ(Resource(0), u"/C0/DIO1");
 }
 
+TEST_F(ExportsOnAProject, AnItemsResourceShowsWithItsDisplayNameAndStatus) {
+    auto* getResource = Export<GetResourceFn>("TIOAttributeSet_GetResource");
+    const WBRefNum bound = AddItem(u"A", u"/C0/DIO0");
+    const WBRefNum conflict = AddItem(u"B", u"/C0/DIO0");
+    const WBRefNum decorated = AddItem(u"C", u"/C0/DIO1");
+    const WBRefNum missing = AddItem(u"D", u"/C0/DIO9");
+    const WBRefNum none = AddItem(u"E", u"");
+    struct Case {
+        WBRefNum refnum;
+        int32_t answer;
+        const char* resource;
+        const char* shown;
+        int32_t status;
+    };
+    for (const Case& c :
+         {Case{bound, S_OK, "/C0/DIO0", "DIO0", 0}, Case{conflict, S_OK, "/C0/DIO0", "DIO0", 2},
+          Case{decorated, S_OK, "/C0/DIO1", "Front LED", 0},
+          Case{missing, S_OK, "/C0/DIO9", "/C0/DIO9", 1}, Case{none, S_OK, "", "", 1},
+          // Not an item: the texts are emptied all the same.
+          Case{tree, E_NOINTERFACE, "", "", 3}}) {
+        const auto resource = NewHostString("old");
+        const auto shown = NewHostString("old");
+        int32_t status = -1;
+        EXPECT_EQ(getResource(&c.refnum, nullptr, resource.get(), shown.get(), &status), c.answer)
+            << c.resource;
+        EXPECT_EQ(HostStringBytes(resource.get()), c.resource);
+        EXPECT_EQ(HostStringBytes(shown.get()), c.shown) << c.resource;
+        EXPECT_EQ(status, c.status) << c.resource;
+    }
+}
+
 TEST_F(ExportsOnAProject, AHostErrorWhileWritingComesBackMappedWithTheOutputUnchanged) {
     auto* dump = Export<DumpFn>("TIOResTree_Dump");
     auto* protocols = Export<ProtocolsFn>("TIOResTree_GetSupportedProtocols");
+    auto* getResource = Export<GetResourceFn>("TIOAttributeSet_GetResource");
+    const WBRefNum item = AddItem(u"A", u"/C0/DIO0");
     const struct {
         WBErr error;
         int32_t status;
@@ -278,6 +312,14 @@ TEST_F(ExportsOnAProject, AHostErrorWhileWritingComesBackMappedWithTheOutputUnch
         FailNthCall(FailingCall::NumericArrayResize, 1, m.error);
         EXPECT_EQ(protocols(&tree, line.get(), list.Ref(), &found), m.status);
         EXPECT_EQ(list.Texts(), (std::vector<std::string>{"x", "y"}));
+        // The texts are emptied before anything else: that first write fails, the status stays 3.
+        int32_t status = -1;
+        const auto shown = NewHostString("old");
+        FailNthCall(FailingCall::NumericArrayResize, 1, m.error);
+        EXPECT_EQ(getResource(&item, nullptr, text.get(), shown.get(), &status), m.status);
+        EXPECT_EQ(HostStringBytes(text.get()), "old");
+        EXPECT_EQ(HostStringBytes(shown.get()), "old");
+        EXPECT_EQ(status, 3);
     }
 }
 
