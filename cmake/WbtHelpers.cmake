@@ -56,6 +56,32 @@ function(wbt_add_test name)
                        PROPERTIES ENVIRONMENT "WBT_SOURCE_DIR=${PROJECT_SOURCE_DIR}")
 endfunction()
 
+# wbt_add_concurrency_test(NAME SOURCES ... [DEPS ...] [FILTER pattern]): tests where threads
+# really meet. Their sources run in their area's binary in every build; under WBT_TSAN they also
+# make a binary of their own, labelled "concurrency" and built by the target concurrency_tests,
+# so that the ThreadSanitizer tree builds and runs only them. FILTER picks the tests of a source
+# that holds other tests too.
+function(wbt_add_concurrency_test name)
+  if(NOT WBT_TSAN)
+    return()
+  endif()
+  cmake_parse_arguments(ARG "" "FILTER" "SOURCES;DEPS" ${ARGN})
+  if(NOT ARG_FILTER)
+    set(ARG_FILTER "*")
+  endif()
+  add_executable(${name} ${ARG_SOURCES})
+  target_link_libraries(${name} PRIVATE ${ARG_DEPS} GTest::gtest GTest::gmock GTest::gtest_main
+                                        Threads::Threads)
+  target_include_directories(${name} PRIVATE ${PROJECT_SOURCE_DIR}/tests)
+  gtest_discover_tests(${name} DISCOVERY_MODE PRE_TEST TEST_FILTER ${ARG_FILTER}
+                       PROPERTIES LABELS concurrency
+                                  ENVIRONMENT "WBT_SOURCE_DIR=${PROJECT_SOURCE_DIR}")
+  if(NOT TARGET concurrency_tests)
+    add_custom_target(concurrency_tests)
+  endif()
+  add_dependencies(concurrency_tests ${name})
+endfunction()
+
 # wbt_add_bench(NAME SOURCES ... [DEPS ...]): one Google Benchmark program (not a test).
 function(wbt_add_bench name)
   cmake_parse_arguments(ARG "" "" "SOURCES;DEPS" ${ARGN})
