@@ -4,6 +4,7 @@
 #include "cli/Demo.h"
 #include "cli/EditCommands.h"
 #include "cli/ExitStatus.h"
+#include "cli/ItemCommands.h"
 #include "cli/ProgramCommand.h"
 #include "cli/ProjectCommands.h"
 #include "runtime/HostFolder.h"
@@ -12,6 +13,7 @@
 #include <filesystem>
 #include <functional>
 #include <iostream>
+#include <map>
 #include <string>
 #include <vector>
 
@@ -248,6 +250,52 @@ void AddEdit(CLI::App& app, Request& request) {
     });
 }
 
+void AddItem(CLI::App& app, Request& request) {
+    auto* item = app.add_subcommand(
+        "item", "act on one item of a target as the project tree does, and save when it "
+                "changed");
+    std::string footer = "  item PROJECT --target T ITEM ACTION ...   ITEM is its place below "
+                         "the target (Folder/Name)\nActions:\n";
+    for (const auto& [name, action] : wbhost::cli::ItemActions()) {
+        std::string line = "  " + name;
+        for (const auto& option : action.options)
+            line += " [" + option.name + " " + option.valueName + "]";
+        line += action.arguments.empty() ? "" : " " + action.arguments;
+        footer +=
+            line + std::string(line.size() < 40 ? 40 - line.size() : 1, ' ') + action.help + "\n";
+    }
+    item->footer(footer);
+    auto path = std::make_shared<std::string>();
+    auto itemRequest = std::make_shared<wbhost::cli::ItemRequest>();
+    item->add_option("PROJECT", *path, "the project file")->required();
+    item->add_option("--target", itemRequest->target, "the target's name")->required();
+    item->add_option("ITEM", itemRequest->item, "the item's place below the target")->required();
+    item->add_option("ACTION", itemRequest->action, "what to do")->required();
+    item->add_option("ARGS", itemRequest->arguments, "the action's arguments");
+    // Every action's options are known to the parser; the frame checks that they go with the
+    // action given.
+    auto given = std::make_shared<std::map<std::string, std::string>>();
+    for (const auto& [name, action] : wbhost::cli::ItemActions()) {
+        for (const auto& option : action.options) {
+            if (item->get_option_no_throw(option.name) == nullptr)
+                item->add_option(option.name, (*given)[option.name], option.help)
+                    ->type_name(option.valueName);
+        }
+    }
+    item->callback([&request, item, path, itemRequest, given] {
+        for (const auto& [name, value] : *given) {
+            if (item->count(name) > 0)
+                itemRequest->options[name] = value;
+        }
+        std::string error;
+        if (!wbhost::cli::CheckItemRequest(*itemRequest, error))
+            throw CLI::ValidationError("item", error);
+        request.run = [&request, path, itemRequest] {
+            return wbhost::cli::RunItem(request.host, *path, *itemRequest, std::cout, std::cerr);
+        };
+    });
+}
+
 void AddProgram(CLI::App& app, Request& request) {
     auto* program = app.add_subcommand(
         "program", "run one host program as the module would, its dialogs answered from "
@@ -320,6 +368,7 @@ int main(int argc, char** argv) {
     AddTreeAndCompare(app, request);
     AddProject(app, request);
     AddEdit(app, request);
+    AddItem(app, request);
     AddProgram(app, request);
     AddDemo(app, request);
 

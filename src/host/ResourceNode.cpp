@@ -21,21 +21,26 @@ template <class Call> std::u16string TextOf(Call&& call) {
     return BstrToString(text);
 }
 
-// Takes over a CoTaskMemAlloc array of COUNT node references.
-std::vector<ResourceNode> TakeNodes(IwbhwResourceTreeNode** nodes, uint32_t count) {
-    std::vector<ResourceNode> list;
+// Takes over a CoTaskMemAlloc array of COUNT references, each held by what ADOPT makes of it.
+template <class Interface, class Adopt>
+auto TakeReferences(Interface** references, uint32_t count, Adopt adopt) {
+    std::vector<decltype(adopt(references[0]))> list;
     try {
         list.reserve(count);
     } catch (...) {
         for (uint32_t i = 0; i < count; ++i)
-            nodes[i]->Release();
-        CoTaskMemFree(nodes);
+            references[i]->Release();
+        CoTaskMemFree(references);
         throw;
     }
     for (uint32_t i = 0; i < count; ++i)
-        list.push_back(ResourceNode::Adopt(nodes[i]));
-    CoTaskMemFree(nodes);
+        list.push_back(adopt(references[i]));
+    CoTaskMemFree(references);
     return list;
+}
+
+std::vector<ResourceNode> TakeNodes(IwbhwResourceTreeNode** nodes, uint32_t count) {
+    return TakeReferences(nodes, count, &ResourceNode::Adopt);
 }
 
 } // namespace
@@ -166,6 +171,15 @@ uint32_t ResourceNode::SaveNotificationState() const {
 
 void ResourceNode::RestoreNotificationState(uint32_t state) const noexcept {
     node_->RestoreNotificationState(state);
+}
+
+std::vector<ComPtr<IwbProjectItem>> ResourceNode::ReservingItems(IwbProjectItem* except) const {
+    uint32_t count = 0;
+    IwbProjectItem** items = nullptr;
+    CheckStatus(node_->GetReservingItems(except, &count, &items));
+    if (items == nullptr)
+        return {};
+    return TakeReferences(items, count, &ComPtr<IwbProjectItem>::Adopt);
 }
 
 } // namespace qv::host

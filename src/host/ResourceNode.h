@@ -4,6 +4,7 @@
 #pragma once
 
 #include "com/ComPtr.h"
+#include "host/contracts/IwbProjectItem.h"
 #include "host/contracts/IwbhwResourceTreeNode.h"
 
 #include <optional>
@@ -56,6 +57,9 @@ public:
     HRESULT Reserve(IwbProjectItem* item, uint32_t mode) const;
     HRESULT QueryReservation(IwbProjectItem* item) const;
     HRESULT ReleaseReservation(IwbProjectItem* item) const;
+    // The project items other than EXCEPT (may be null) that reserve the node, in the host's
+    // order.
+    std::vector<qv::com::ComPtr<IwbProjectItem>> ReservingItems(IwbProjectItem* except) const;
 
     // Runs BODY with the node's notifications silenced, restoring them whatever BODY does.
     template <class Body> void Silenced(Body&& body) const;

@@ -5,6 +5,7 @@
 #include "framework/CqxProjectItemUI.h"
 #include "framework/IwbProjectCutCopyPaste3.h"
 #include "framework/IwbProjectDragDrop.h"
+#include "framework/IwbProjectItemObserver.h"
 
 #include <deque>
 #include <functional>
@@ -13,16 +14,20 @@ namespace wbhw {
 
 class BaseItemUI : public CqxProjectItemUI,
                    public IwbProjectDragDrop,
+                   public IwbProjectItemObserver,
                    public IwbProjectCutCopyPaste3 {
 public:
     using Interfaces =
-        CqxProjectItemUI::Interfaces::Append<IwbProjectDragDrop, IwbProjectCutCopyPaste3>;
+        CqxProjectItemUI::Interfaces::Append<IwbProjectDragDrop, IwbProjectItemObserver,
+                                             IwbProjectCutCopyPaste3>;
 
     // Refuses without a dragged object or one that is not the framework's drag data; otherwise
     // the base's compatibility check decides.
     HRESULT DropAllowed(IUnknown* dragged) override;
     // Leaves the drop to the framework: answers 0 and sets HANDLED to 1.
     HRESULT Drop(IUnknown* dragged, int32_t* handled) override;
+    // The base has nothing to follow: every event is taken.
+    HRESULT OnProjectItemEvents(uint32_t, const WbProjectItemEvent*) override { return S_OK; }
     // Remembers whether KEEPSOURCE was non-zero.
     HRESULT PrepareCutCopyPaste(uint32_t operation, int32_t keepSource) override;
 

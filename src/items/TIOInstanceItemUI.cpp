@@ -216,14 +216,17 @@ void TIOInstanceItemUI::ApplyHiddenRule(const ResourceNode& resource) {
         hide();
 }
 
+void TIOInstanceItemUI::LetGoOfTree(const ResourceNode& root) {
+    if (!root)
+        return;
+    root.RemoveObserver(AsObserver(), tio::kind::kAny, true);
+    if (const ResourceNode node = ResourceNodeOf(root))
+        node.ReleaseReservation(HostItem());
+}
+
 HRESULT TIOInstanceItemUI::Detach() {
     return GuardCall([&] {
-        const ResourceNode root = TreeRoot();
-        if (!root)
-            return S_OK;
-        root.RemoveObserver(AsObserver(), tio::kind::kAny, true);
-        if (const ResourceNode node = ResourceNodeOf(root))
-            node.ReleaseReservation(HostItem());
+        LetGoOfTree(TreeRoot());
         return S_OK;
     });
 }

@@ -52,6 +52,20 @@ public:
     HRESULT Bind(IwbProjectItem* item) override;
     HRESULT GetIconName(BSTR* name) override;
     HRESULT IsValid() override;
+    // IqxProjectItemUI: accepts NAME (trimmed) when it is the current name in another case, or
+    // holds no invalid character and no other resource item of the name scope carries it.
+    HRESULT ValidateNewName(const char16_t* name) override;
+
+    // The name scope of ITEM: the nearest ancestor whose object is an item scope, else the
+    // target that owns its resource tree. SCOPE receives it with a reference.
+    HRESULT FindNameScope(IwbProjectItem* item, IwbProjectItem** scope);
+    // S_OK when a resource item below SCOPE is called NAME (case aside), S_FALSE when none is.
+    HRESULT IsNameInUse(IwbProjectItem* scope, std::u16string_view name);
+    // Whether the item is in error: S_OK when it is, S_FALSE when not. TEXT (optional) receives
+    // the message with the item names filled in, MISSING (optional) whether the resource is
+    // missing, OFFENDING (optional) the other item that reserves the resource.
+    HRESULT GetErrorInformation(std::u16string* text, bool* missing,
+                                qv::com::ComPtr<IwbProjectItem>* offending);
 
     // TIOAttrBag::ChangeObserver: writes the bag into "tioAttrBag" when its text changed.
     int32_t OnAttrBagChanged(TIOAttrBag& set, bool wasDirty, bool forced) override;
@@ -71,6 +85,7 @@ public:
     // IwbTIOItemUIPrivate
     HRESULT SetAttributes(uint32_t count, const char16_t* const* texts) override;
     HRESULT GetDecoratedName(BSTR* name, int32_t* fromResource) override;
+    HRESULT GenerateUniqueName(const char16_t* proposed, BSTR* unique) override;
 
     // IwbTIOGAttributeSet
     HRESULT GetAttribute(const char16_t* path, BSTR* value) override;
@@ -85,6 +100,11 @@ public:
     // IwbTIOItemError
     HRESULT HasError() override;
     HRESULT GetErrorText(BSTR* text) override;
+    HRESULT GetErrorCategory(BSTR* text, BSTR* title, int32_t* category) override;
+
+    // IwbProjectItemObserver: a move to another target lets go of the old target's tree and
+    // binds in the new one; a move within a target changes nothing.
+    HRESULT OnProjectItemEvents(uint32_t count, const WbProjectItemEvent* events) override;
 
     // IwbTIOItemScope
     HRESULT GetScope(uint32_t* count, GUID** types, BSTR** names) override;
@@ -122,6 +142,10 @@ private:
     HRESULT OnWatchEvent(const qv::host::ResourceNode& node, uint32_t events);
     void OnSignatureEvent(const qv::host::ResourceNode& node, uint32_t events);
 
+    // Removes every watch of the item from the tree at ROOT and releases the reservation of the
+    // node at the working set's path there (nothing for an empty ROOT).
+    void LetGoOfTree(const qv::host::ResourceNode& root);
+
     // Watches on the resource node's attribute definitions (kind 3).
     void ObserveDefinitions(const qv::host::ResourceNode& resource, uint32_t events);
     void StopDefinitions(const qv::host::ResourceNode& resource);
@@ -141,6 +165,12 @@ private:
     // The working set's "resource" path ("" before the item is loaded).
     std::u16string ResourcePathValue() const;
     qv::com::ComPtr<IwbProjectPropertyBag> Properties() const;
+    // The host item's name.
+    std::u16string HostItemName() const;
+    // PROPOSED when no resource item of the item's name scope carries it (case aside), else
+    // what the host's unique-name program makes of it next to the names there. Failing host
+    // calls throw StatusError.
+    std::u16string UniqueNameInScope(std::u16string_view proposed);
     IwbhwResourceTreeNodeObserver* AsObserver() { return this; }
     IUnknown* Self();
 

@@ -39,6 +39,9 @@ struct IwbTIOItemUIPrivate : IUnknown {
     // The name the resource suggests for the item in NAME (null when empty); FROMRESOURCE
     // (optional) receives 0 when it came from the node's "NameDecoration", else 1.
     virtual HRESULT GetDecoratedName(BSTR* name, int32_t* fromResource) = 0;
+    // A name for an item of this item's name scope: PROPOSED when no resource item there carries
+    // it, else the one the host's unique-name program makes of it (in UNIQUE).
+    virtual HRESULT GenerateUniqueName(const char16_t* proposed, BSTR* unique) = 0;
 };
 
 // The item's attributes, by path and by name.
@@ -72,8 +75,13 @@ struct IwbTIOItemError : IUnknown {
 
     // S_OK when the item has an error, S_FALSE when not.
     virtual HRESULT HasError() = 0;
-    // The error text in TEXT (empty when there is none).
+    // The error text in TEXT (empty when there is none): the message that names the item, and
+    // for a conflict the item that holds its resource too.
     virtual HRESULT GetErrorText(BSTR* text) = 0;
+    // The error text in TEXT, the category's title in TITLE (both required) and the category:
+    // 0 resource missing, 1 physical resource missing, 2 resource held by another item too,
+    // 3 no error.
+    virtual HRESULT GetErrorCategory(BSTR* text, BSTR* title, int32_t* category) = 0;
 };
 
 // The chain of project items from the item's target down to the item.

@@ -2,7 +2,9 @@
 // physical flag, error and scope; and the edits of its resource and attributes.
 #include "attribute_bag/ItemResourceContext.h"
 #include "com/CallGuard.h"
+#include "com/PutBstr.h"
 #include "com/TaskMem.h"
+#include "host/ProjectItemQueries.h"
 #include "host/StatusError.h"
 #include "items/TIOInstanceItemUI.h"
 #include "items/TIOItemProperties.h"
@@ -14,16 +16,11 @@
 using qv::com::AllocBstr;
 using qv::com::ComPtr;
 using qv::com::GuardCall;
+using qv::com::PutBstr;
 using qv::host::CheckStatus;
 using qv::host::ResourceNode;
 
 namespace {
-
-// Hands TEXT out as a new BSTR in *OUT.
-HRESULT PutText(std::u16string_view text, BSTR* out) {
-    *out = AllocBstr(text);
-    return *out != nullptr ? S_OK : E_OUTOFMEMORY;
-}
 
 // Hands TEXTS out as a CoTaskMemAlloc array of new BSTRs; nothing is handed out on failure.
 HRESULT PutTexts(const std::vector<std::u16string>& texts, uint32_t* count, BSTR** out) {
@@ -98,7 +95,7 @@ HRESULT TIOInstanceItemUI::GetResource(BSTR* path, int32_t* exists, int32_t* res
         *reserved = 0;
     return GuardCall([&]() -> HRESULT {
         const std::u16string resource = ResourcePathValue();
-        if (const HRESULT hr = PutText(resource, path); FAILED(hr))
+        if (const HRESULT hr = PutBstr(resource, path); FAILED(hr))
             return hr;
         if (resource.empty())
             return S_FALSE;
@@ -167,7 +164,7 @@ HRESULT TIOInstanceItemUI::GetDecoratedName(BSTR* name, int32_t* fromResource) {
                 decorated = wbhw::UnescapeListText(node.Name(), u'/');
             }
         }
-        return decorated.empty() ? S_OK : PutText(decorated, name);
+        return decorated.empty() ? S_OK : PutBstr(decorated, name);
     });
 }
 
@@ -186,7 +183,7 @@ HRESULT TIOInstanceItemUI::GetAttribute(const char16_t* path, BSTR* value) {
         const std::u16string_view attribute =
             slash == std::u16string_view::npos ? text : text.substr(slash + 1);
         const std::u16string* found = set != nullptr ? set->FindValue(attribute) : nullptr;
-        return found != nullptr ? PutText(*found, value) : S_FALSE;
+        return found != nullptr ? PutBstr(*found, value) : S_FALSE;
     });
 }
 
@@ -237,14 +234,6 @@ HRESULT TIOInstanceItemUI::HasError() {
     return resourceStatus_ != tio::status::kBound ? S_OK : S_FALSE;
 }
 
-HRESULT TIOInstanceItemUI::GetErrorText(BSTR* text) {
-    if (text == nullptr)
-        return E_POINTER;
-    *text = nullptr;
-    // The texts that explain a missing or held resource come with the item's naming rules.
-    return HasError() == S_OK ? E_NOTIMPL : PutText(u"", text);
-}
-
 HRESULT TIOInstanceItemUI::GetScope(uint32_t* count, GUID** types, BSTR** names) {
     if (count == nullptr || types == nullptr || names == nullptr)
         return E_POINTER;
@@ -261,13 +250,9 @@ HRESULT TIOInstanceItemUI::GetScope(uint32_t* count, GUID** types, BSTR** names)
         std::vector<std::u16string> chainNames;
         for (ComPtr<IwbProjectItem> at = ComPtr<IwbProjectItem>::Share(HostItem()); at;) {
             GUID type{};
-            BSTR name = nullptr;
             CheckStatus(at->GetTypeGuid(&type));
-            const HRESULT named = at->GetName(&name);
-            const qv::com::UniqueBstr held(name);
-            CheckStatus(named);
             chainTypes.insert(chainTypes.begin(), type);
-            chainNames.insert(chainNames.begin(), qv::com::BstrToString(name));
+            chainNames.insert(chainNames.begin(), qv::host::ItemName(*at.Get()));
             if (at.Get() == context.Owner())
                 break;
             ComPtr<IwbProjectItem> parent;

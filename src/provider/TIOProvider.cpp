@@ -1,6 +1,8 @@
 // The provider's overrides of the framework base, and its project attachment.
 #include "provider/TIOProvider.h"
 
+#include "attribute_bag/ItemResourceContext.h"
+#include "com/CallGuard.h"
 #include "com/ComInit.h"
 #include "framework/IqxProjectItemValidator.h"
 #include "items/TIOStrings.h"
@@ -60,6 +62,20 @@ HRESULT TIOProvider::TypeNameHook(const GUID& type, BSTR* name) {
 
 CLSID TIOProvider::ClassIdHook() {
     return tio::kProviderClassId;
+}
+
+HRESULT TIOProvider::CheckItem(IwbProjectItem* item) {
+    if (item == nullptr)
+        return E_POINTER;
+    return qv::com::GuardCall([&]() -> HRESULT {
+        GUID type{};
+        if (const HRESULT hr = item->GetTypeGuid(&type); FAILED(hr))
+            return hr;
+        if (IsEqualGUID(type, wbhw::item_type::kPassThrough))
+            return S_FALSE;
+        ItemResourceContext context;
+        return context.Fill(item, true);
+    });
 }
 
 HRESULT TIOProvider::AttachTo(IUnknown* project) {

@@ -7,14 +7,16 @@
 #include "framework/IqxProviderSite.h"
 #include "host/contracts/IwbProjectNameProvider.h"
 #include "host/contracts/IwbProjectProvider.h"
+#include "items/CommonChildValidatorImpl.h"
 
 class TIOProvider : public CqxProvider,
                     public IwbProjectProvider,
                     public IqxProviderSite,
-                    public IwbProjectNameProvider {
+                    public IwbProjectNameProvider,
+                    public wbhw::CommonChildValidatorImpl {
 public:
     using Interfaces = CqxProvider::Interfaces::Append<IwbProjectProvider, IqxProviderSite,
-                                                       IwbProjectNameProvider>;
+                                                       IwbProjectNameProvider, IwbChildValidator>;
 
     // Runs the base initialisation, keeps the framework's root object and records the module
     // handle; answers the base's result.
@@ -44,6 +46,11 @@ public:
                   int32_t* status) override;
     HRESULT OnSelect(WbNameControlEvent* event) override;
     HRESULT Reserved9() override { return S_OK; }
+
+    // IwbChildValidator: the provider's check of a place ITEM: refused (1) for the items of the
+    // pass-through type, else 0 when an ancestor of ITEM (or ITEM) owns a resource tree, 1 when
+    // none does.
+    HRESULT CheckItem(IwbProjectItem* item) override;
 
     // The framework's root object kept at initialisation (no reference added); null before.
     IUnknown* projectRoot() const { return projectRoot_; }

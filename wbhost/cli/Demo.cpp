@@ -3,6 +3,7 @@
 
 #include "cli/Commands.h"
 #include "cli/EditCommands.h"
+#include "cli/ItemCommands.h"
 #include "cli/ProgramCommand.h"
 #include "cli/ProjectCommands.h"
 
@@ -183,11 +184,14 @@ void PlayProject(Transcript& script, const HostOptions& options, const std::stri
                  const WorkFolder& work) {
     const std::string project = work.File("demo.wbproj");
     const std::string description = (fs::path(examples) / "KestrelK40.xml").string();
-    script.Step("Create a project with the K-40 as target \"K40\"",
-                "project new " + project + " --target K40=" + description,
-                {0, {"created", "target \"K40\""}, {}}, [&](std::ostream& out, std::ostream& err) {
-                    return RunProjectNew(options, project, {"K40=" + description}, true, out, err);
-                });
+    script.Step(
+        "Create a project with two K-40 boards, targets \"K40\" and \"K40B\"",
+        "project new " + project + " --target K40=" + description + " --target K40B=" + description,
+        {0, {"created", "target \"K40\"", "target \"K40B\""}, {}},
+        [&](std::ostream& out, std::ostream& err) {
+            return RunProjectNew(options, project, {"K40=" + description, "K40B=" + description},
+                                 true, out, err);
+        });
     const auto addItem = [&](const std::string& title, const AddItemRequest& item,
                              const Expect& expect) {
         std::string command = "project add-item " + project + " --target " + item.target +
@@ -385,6 +389,49 @@ void PlayBulkImport(Transcript& script, const HostOptions& options, const WorkFo
         });
 }
 
+void PlayItemCommands(Transcript& script, const HostOptions& options, const WorkFolder& work) {
+    const std::string project = work.File("demo.wbproj");
+    const auto item = [&](const std::string& title, const ItemRequest& request,
+                          const Expect& expect) {
+        std::string command = "item " + project + " --target " + request.target + " " +
+                              request.item + " " + request.action;
+        for (const auto& [name, value] : request.options)
+            command += " " + name + " " + value;
+        for (const std::string& argument : request.arguments)
+            command += " \"" + argument + "\"";
+        script.Step(title, command, expect, [&](std::ostream& out, std::ostream& err) {
+            return RunItem(options, project, request, out, err);
+        });
+    };
+    item("Rename \"Valve\" to a name holding \"|\": the module refuses, nothing changes",
+         {"K40", "Valve", "rename", {"Va|ve"}, {}}, {1, {"refuses to rename"}, {"renamed"}});
+    item("Rename \"Backup\" to \"VALVE\": the name is in use in another case",
+         {"K40", "Backup", "rename", {"VALVE"}, {}}, {1, {"refuses to rename"}, {"renamed"}});
+    item("Rename \"Backup\" to \" Standby \": the blanks go",
+         {"K40", "Backup", "rename", {" Standby "}, {}},
+         {0, {"renamed \"Backup\" to \"Standby\""}, {}});
+    item("Move \"Pressure\" out of its folder: same target, it keeps its binding",
+         {"K40", "Sensors/Pressure", "move", {"/"}, {}},
+         {0, {"moved \"Pressure\" to target \"K40\"", "Pressure: bound"}, {}});
+    item("Move \"Pressure\" to the other board: it binds to that board's input",
+         {"K40", "Pressure", "move", {}, {{"--to-target", "K40B"}}},
+         {0,
+          {"moved \"Pressure\" to target \"K40B\"",
+           "Pressure: bound, resource \"/AnalogInputs/AI2\""},
+          {}});
+    script.Step(
+        "The listing tells why an item is in error: both items of the conflict are named",
+        "project list " + project + " --json",
+        {0,
+         {"\"error\": \"The I/O item \\\"Standby\\\" uses the same resource as the "
+          "I/O item \\\"Valve\\\""},
+         {}},
+        [&](std::ostream& out, std::ostream& err) {
+            return RunProjectJson(options, project, out, err);
+        },
+        20);
+}
+
 void PlayPrograms(Transcript& script, const HostOptions& options) {
     script.Step("A unique name next to the names taken",
                 "program TIOGenUniqueName.gx --input 0=text:Valve --input \"1=list:Valve|Valve1\"",
@@ -430,6 +477,7 @@ int RunDemo(const HostOptions& options, const DemoSettings& settings, std::ostre
     PlayDescriptions(script, options, settings.examples);
     PlayProject(script, options, settings.examples, work);
     PlayEdits(script, options, work);
+    PlayItemCommands(script, options, work);
     PlayBulkImport(script, options, work);
     PlayPrograms(script, options);
     if (script.Failures() != 0) {

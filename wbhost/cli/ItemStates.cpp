@@ -57,6 +57,10 @@ void AskObject(IUnknown* object, ItemState& state) {
         if (auto path = AskText([&](BSTR* text) { return resource->GetResourcePath(text); }))
             state.resource = std::move(*path);
     }
+    if (const auto error = qv::com::QueryAs<IwbTIOItemError>(object)) {
+        if (auto text = AskText([&](BSTR* text) { return error->GetErrorText(text); }))
+            state.error = std::move(*text);
+    }
     if (const auto compile = qv::com::QueryAs<IwbCompileConfiguration>(object)) {
         state.compileConfiguration =
             AskText([&](BSTR* text) { return compile->GetCompileConfiguration(text); });
@@ -74,6 +78,8 @@ ItemState StateOf(const project::ProjectItem& item, std::u16string path) {
     state.hidden = (item.Flags() & wbproj::kShownFlag) == 0;
     if (const Property* version = Find(bag, u"tioFeatureSetVersion", Property::Kind::Int))
         state.featureSetVersion = version->number;
+    if (const Property* physical = Find(bag, u"QV.WB.TIO.Physical", Property::Kind::Bool))
+        state.physical = physical->number != 0;
     AskObject(item.Object(), state);
     return state;
 }

@@ -25,6 +25,11 @@ struct ItemState {
     // What code built against the item depends on; empty when the item has no object that
     // tells it.
     std::optional<std::u16string> compileConfiguration;
+    // Why the item is in error, as its object explains it; empty when it is not (or has no
+    // object to ask).
+    std::u16string error;
+    // The item stands for a physical resource ("QV.WB.TIO.Physical").
+    bool physical = false;
 };
 
 // The Tangent I/O items anywhere below TARGET, in tree order.

@@ -5,6 +5,7 @@
 #include "cli/HostText.h"
 #include "cli/ItemList.h"
 #include "cli/ItemListing.h"
+#include "cli/ItemPlace.h"
 #include "cli/NewItemChecks.h"
 #include "cli/ProjectJson.h"
 #include "kern/Collate.h"
@@ -19,15 +20,6 @@ namespace wbhost::cli {
 namespace {
 
 using project::ProjectItem;
-
-// The child of PARENT called NAME (without regard to case), or null.
-ProjectItem* ChildNamed(const ProjectItem& parent, std::u16string_view name) {
-    for (const auto& child : parent.Children()) {
-        if (qv::kern::EqualsNoCase(child->Name(), name))
-            return child.Get();
-    }
-    return nullptr;
-}
 
 // Makes the wizard program answer TEXT as the one item to create, unless the session's answers
 // say otherwise already.
@@ -191,13 +183,8 @@ int RunRemoveItem(const HostOptions& options, const std::string& projectPath,
     ProjectItem* target = FindTarget(project, targetName, err);
     if (target == nullptr)
         return kProjectFailed;
-    ProjectItem* item = target;
-    for (const std::u16string& part : PlaceParts(FromUtf8(itemPath))) {
-        item = ChildNamed(*item, part);
-        if (item == nullptr)
-            break;
-    }
-    if (item == nullptr || item == target) {
+    ProjectItem* item = ItemAt(*target, FromUtf8(itemPath));
+    if (item == nullptr) {
         err << "wbhost: target \"" << targetName << "\" has no item \"" << itemPath << "\"\n";
         return kProjectFailed;
     }

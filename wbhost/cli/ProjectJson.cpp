@@ -20,7 +20,9 @@ json ItemJson(const ItemState& state) {
                  {"status", nullptr},
                  {"statusText", "not reported"},
                  {"hidden", state.hidden},
-                 {"featureSetVersion", state.featureSetVersion}};
+                 {"featureSetVersion", state.featureSetVersion},
+                 {"error", ToUtf8(state.error)},
+                 {"physical", state.physical}};
     if (state.compileConfiguration)
         item["compileConfiguration"] = ToUtf8(*state.compileConfiguration);
     if (state.status) {

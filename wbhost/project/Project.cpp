@@ -3,6 +3,8 @@
 
 #include "framework/IqxBindable.h"
 #include "framework/IqxItemUI.h"
+#include "framework/IwbChildValidator.h"
+#include "framework/IwbProjectItemObserver.h"
 #include "kern/Guid.h"
 #include "kern/Utf8.h"
 #include "project/AtomicFile.h"
@@ -13,6 +15,7 @@
 #include <algorithm>
 #include <functional>
 #include <unordered_map>
+#include <unordered_set>
 
 namespace wbhost::project {
 
@@ -43,6 +46,30 @@ HRESULT AnnounceRemoval(ProjectItem& item) {
     }
     if (const auto object = qv::com::QueryAs<IqxItemUI>(item.Object())) {
         const HRESULT hr = object->Remove();
+        if (SUCCEEDED(first) && FAILED(hr))
+            first = hr;
+    }
+    return first;
+}
+// The target at or above ITEM; null when there is none.
+const ProjectItem* TargetAbove(const ProjectItem& item) {
+    for (const ProjectItem* at = &item; at != nullptr; at = at->Parent()) {
+        if (IsEqualGUID(at->Type(), kTargetType))
+            return at;
+    }
+    return nullptr;
+}
+
+// Tells the objects of ITEM and of everything below it (ITEM's first) that EVENT moved them; the
+// first failure is answered after all were told.
+HRESULT AnnounceMove(ProjectItem& item, const WbProjectItemEvent& event) {
+    HRESULT first = S_OK;
+    if (const auto observer = qv::com::QueryAs<IwbProjectItemObserver>(item.Object()))
+        first = observer->OnProjectItemEvents(1, &event);
+    // The list may change while an object is told; walk a held copy.
+    const auto children = item.Children();
+    for (const auto& child : children) {
+        const HRESULT hr = AnnounceMove(*child.Get(), event);
         if (SUCCEEDED(first) && FAILED(hr))
             first = hr;
     }
@@ -174,6 +201,50 @@ HRESULT Project::RemoveItem(ProjectItem& item) {
     return FAILED(announced) ? announced : S_OK;
 }
 
+HRESULT Project::MoveItem(ProjectItem& item, ProjectItem& newParent) {
+    ProjectItem* const oldParent = item.Parent();
+    if (oldParent == nullptr || IsEqualGUID(item.Type(), kTargetType))
+        return E_INVALIDARG;
+    if (FindById(item.Id()) != &item || FindById(newParent.Id()) != &newParent)
+        return S_FALSE;
+    for (const ProjectItem* at = &newParent; at != nullptr; at = at->Parent()) {
+        if (at == &item)
+            return E_INVALIDARG; // into itself
+    }
+    if (oldParent == &newParent)
+        return S_OK;
+    if (const HRESULT allowed = AllowsChild(newParent, item.Type()); allowed != S_OK)
+        return FAILED(allowed) ? allowed : E_ACCESSDENIED;
+    const bool otherTarget = TargetAbove(*oldParent) != TargetAbove(newParent);
+    newParent.AdoptChild(oldParent->ReleaseChild(&item));
+    // Items that change target ask for their resources there now, behind the items already
+    // there; reopening binds in this order, so it must say so, or the statuses would turn.
+    if (otherTarget)
+        Resequence(item);
+    const WbProjectItemEvent event{wbproj::item_event::kMoved, &item, oldParent, &newParent};
+    return AnnounceMove(item, event);
+}
+
+void Project::Resequence(ProjectItem& item) {
+    item.SetSequence(NextSequence());
+    for (const auto& child : item.Children())
+        Resequence(*child.Get());
+}
+
+HRESULT Project::AllowsChild(ProjectItem& parent, const GUID& type) {
+    for (const auto& provider : providers_) {
+        const auto validator = qv::com::QueryAs<IwbChildValidator>(provider.Get());
+        if (!validator)
+            continue;
+        // The common answer, then the provider's own check of the place.
+        if (const HRESULT hr = validator->ValidateChild(&parent, type); hr != S_OK)
+            return hr;
+        if (const HRESULT hr = validator->CheckItem(&parent); hr != S_OK)
+            return hr;
+    }
+    return S_OK;
+}
+
 ProjectItem* Project::FindById(const GUID& id) {
     std::function<ProjectItem*(ProjectItem&)> find = [&](ProjectItem& item) -> ProjectItem* {
         if (IsEqualGUID(item.Id(), id))
@@ -200,9 +271,22 @@ SavedProject Project::Snapshot() const {
     std::stable_sort(items.begin(), items.end(), [](const ProjectItem* a, const ProjectItem* b) {
         return a->Sequence() < b->Sequence();
     });
+    // A moved item may now lie below a folder made after it. The folders on its way are
+    // written just before it then, so parents still come first and the items keep their order.
+    std::vector<const ProjectItem*> ordered;
+    std::unordered_set<const ProjectItem*> placed;
+    std::function<void(const ProjectItem*)> place = [&](const ProjectItem* item) {
+        if (item == nullptr || placed.count(item) != 0)
+            return;
+        place(item->Parent());
+        placed.insert(item);
+        ordered.push_back(item);
+    };
+    for (const ProjectItem* item : items)
+        place(item);
     std::unordered_map<const ProjectItem*, size_t> indexOf;
     SavedProject saved;
-    for (const ProjectItem* item : items) {
+    for (const ProjectItem* item : ordered) {
         SavedItem entry;
         entry.id = item->Id();
         entry.type = item->Type();

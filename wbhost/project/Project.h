@@ -70,6 +70,18 @@ public:
     // the root or a target (targets stay with their description), S_FALSE for an item of
     // another project. An object's failure is answered after the items are gone.
     HRESULT RemoveItem(ProjectItem& item);
+    // Moves ITEM, with everything below it, to the end of NEWPARENT's children, then tells the
+    // object of ITEM and of each item below it (IwbProjectItemObserver, a move event naming ITEM
+    // and both parents). Every attached provider that validates children is asked first whether
+    // ITEM's type may go under NEWPARENT; a refusal answers E_ACCESSDENIED and moves nothing.
+    // E_INVALIDARG for the root, a target or a move into ITEM itself; S_FALSE when either item
+    // is not of this project; S_OK, telling nobody, when NEWPARENT is ITEM's parent already. An
+    // object's failure is answered after the move. Items that change target come last in the
+    // order items came into the project (see Snapshot), as they asked for their resources last.
+    HRESULT MoveItem(ProjectItem& item, ProjectItem& newParent);
+    // Whether every attached provider that validates children lets an item of TYPE go under
+    // PARENT: S_OK, S_FALSE (refused) or a provider's failure.
+    HRESULT AllowsChild(ProjectItem& parent, const GUID& type);
     // The map from information records to objects.
     const qv::com::ComPtr<IwbProjectItemUIMap>& UIMap() const noexcept { return uiMap_; }
     // The item with identifier ID, or null.
@@ -108,6 +120,9 @@ public:
                                          ObjectFactory factory = {});
 
 private:
+    // Puts ITEM and everything below it (parents first) at the end of the order in which items
+    // came into the project.
+    void Resequence(ProjectItem& item);
     bool Build(const SavedProject& saved, std::string* error);
     // Loads DESCRIPTION and makes ITEM the target that owns its tree.
     HRESULT AttachTarget(ProjectItem& item, const std::string& description, std::string* error);

@@ -203,14 +203,29 @@ ComPtr<ProjectItem> ProjectItem::AddChild(const GUID& type, const GUID& id, std:
 }
 
 bool ProjectItem::RemoveChild(ProjectItem* child) {
+    const ComPtr<ProjectItem> held = ReleaseChild(child);
+    if (!held)
+        return false;
+    held->Close();
+    return true;
+}
+
+ComPtr<ProjectItem> ProjectItem::ReleaseChild(ProjectItem* child) {
     const auto it = std::find_if(children_.begin(), children_.end(),
                                  [&](const auto& each) { return each.Get() == child; });
     if (it == children_.end())
-        return false;
-    const ComPtr<ProjectItem> held = *it;
+        return {};
+    ComPtr<ProjectItem> held = std::move(*it);
     children_.erase(it);
-    held->Close();
-    return true;
+    held->parent_ = nullptr;
+    return held;
+}
+
+void ProjectItem::AdoptChild(ComPtr<ProjectItem> child) {
+    if (!child)
+        return;
+    child->parent_ = this;
+    children_.push_back(std::move(child));
 }
 
 void ProjectItem::Close() {

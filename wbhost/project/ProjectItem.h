@@ -60,12 +60,18 @@ public:
     qv::com::ComPtr<ProjectItem> AddChild(const GUID& type, const GUID& id, std::u16string name);
     // Removes CHILD from the children and closes it; false when it is not a child.
     bool RemoveChild(ProjectItem* child);
+    // Takes CHILD out of the children without closing it (it keeps its children and object)
+    // and answers it; empty when it is not a child.
+    qv::com::ComPtr<ProjectItem> ReleaseChild(ProjectItem* child);
+    // Appends CHILD (taken out of another item) to the children and becomes its parent.
+    void AdoptChild(qv::com::ComPtr<ProjectItem> child);
     // Lets go of the object, the children (closing them) and the parent and project links, so
     // references still held elsewhere reach a detached item instead of freed memory.
     void Close();
 
     // Where the item stands in the order items came into its project.
     uint64_t Sequence() const noexcept { return sequence_; }
+    void SetSequence(uint64_t sequence) noexcept { sequence_ = sequence; }
 
     // The status of the last attempt to make and bind the item's object (S_OK when it bound or
     // the item needs none).

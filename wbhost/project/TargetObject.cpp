@@ -2,6 +2,10 @@
 #include "project/TargetObject.h"
 
 #include "com/CallGuard.h"
+#include "com/PutBstr.h"
+#include "host/ResourceNode.h"
+#include "host/StatusError.h"
+#include "kern/Collate.h"
 
 namespace wbhost::project {
 
@@ -41,6 +45,22 @@ HRESULT TargetObject::GetResourceTreeRoot(IwbhwResourceTreeNode** root) {
 HRESULT TargetObject::ListResourceNames(const char16_t* ioInterface, const char16_t* protocolFilter,
                                         BSTR** names, uint32_t* count) {
     return target_->hardware->ListResourceNames(ioInterface, protocolFilter, names, count);
+}
+
+HRESULT TargetObject::GetProperty(const char16_t* name, BSTR* value) {
+    if (name == nullptr || value == nullptr)
+        return E_POINTER;
+    *value = nullptr;
+    return qv::com::GuardCall([&]() -> HRESULT {
+        if (qv::kern::EqualsNoCase(name, u"Type"))
+            return qv::com::PutBstr(u"{B824FFC7-1B3E-4521-A49E-679E3411987D}", value);
+        if (!qv::kern::EqualsNoCase(name, u"Target Class"))
+            return S_FALSE;
+        IwbhwResourceTreeNode* root = nullptr;
+        qv::host::CheckStatus(GetResourceTreeRoot(&root));
+        const auto targetClass = qv::host::ResourceNode::Adopt(root).Attribute(u"TargetClass");
+        return qv::com::PutBstr(targetClass.value_or(std::u16string()), value);
+    });
 }
 
 } // namespace wbhost::project

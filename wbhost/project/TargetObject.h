@@ -3,6 +3,7 @@
 
 #include "com/ComObject.h"
 #include "com/ComPtr.h"
+#include "host/contracts/IwbChildPlacement.h"
 #include "host/contracts/IwbProjectItemScope.h"
 #include "host/contracts/IwbTargetItemChange.h"
 #include "host/contracts/IwbhwResourceTreeProvider.h"
@@ -14,16 +15,22 @@
 
 namespace wbhost::project {
 
-// A target is a name scope: I/O item names need only be unique below it.
+// A target is a name scope: I/O item names need only be unique below it. It takes items of
+// every type below it, and as a candidate for placement below an FPGA host it tells its type
+// (an FPGA target), its class (its tree root's "TargetClass", "" when absent: the root itself
+// describes it) and its tree, where the hosts it supports are described.
 class TargetObject : public HostItemObject,
                      public IwbTargetItemChange,
                      public IwbhwResourceTreeProvider,
                      public IwbhwTargetResources,
-                     public IwbProjectItemScope {
+                     public IwbProjectItemScope,
+                     public IwbChildTypeValidator,
+                     public IwbItemObjectProperties,
+                     public IwbProjectResourceService {
 public:
-    using Interfaces =
-        HostItemObject::Interfaces::Append<IwbTargetItemChange, IwbhwResourceTreeProvider,
-                                           IwbhwTargetResources, IwbProjectItemScope>;
+    using Interfaces = HostItemObject::Interfaces::Append<
+        IwbTargetItemChange, IwbhwResourceTreeProvider, IwbhwTargetResources, IwbProjectItemScope,
+        IwbChildTypeValidator, IwbItemObjectProperties, IwbProjectResourceService>;
     // The object of ITEM, which owns TARGET (kept alive by the service, which outlives the
     // project).
     TargetObject(IwbProjectItem* item, resources::Target* target)
@@ -37,6 +44,11 @@ public:
     HRESULT GetResourceTreeRoot(IwbhwResourceTreeNode** root) override;
     HRESULT ListResourceNames(const char16_t* ioInterface, const char16_t* protocolFilter,
                               BSTR** names, uint32_t* count) override;
+    HRESULT AllowsChildType(const GUID&) override { return S_OK; }
+    HRESULT GetProperty(const char16_t* name, BSTR* value) override;
+    HRESULT GetResourceTree(IwbhwResourceTreeNode** root) override {
+        return GetResourceTreeRoot(root);
+    }
 
     // Host side: the items handled while not suspended, in order (references held).
     const std::vector<qv::com::ComPtr<IUnknown>>& Changed() const noexcept { return changed_; }
