@@ -3,12 +3,14 @@
 // made and bound), renaming the connector (every item follows) and creating the items in one
 // bulk call of TIO_CreateMultiple, as a host program does. Reports the processor time
 // per item and, for 10,000 items, its ratio to the same figure at 1,000 items measured in the
-// same run (near 1 when no walk is quadratic), and the notifications one rename delivers.
+// same run (near 1 when no walk is quadratic), and the notifications one rename delivers. Also
+// the item's judgement of a new name, which looks through every item of its target.
 #include "cli/AttributeSet.h"
 #include "cli/HostStringList.h"
 #include "cli/HostText.h"
 #include "cli/HostedModule.h"
 #include "cli/ItemStates.h"
+#include "framework/IqxProjectItemUI.h"
 #include "kern/IntegerText.h"
 #include "project/AtomicFile.h"
 #include "project/ProjectFormat.h"
@@ -331,10 +333,51 @@ void BM_CreateMultiple(benchmark::State& state) {
     state.counters["items_bound_per_pair"] = bound / static_cast<double>(state.iterations());
 }
 
+// Processor seconds of ten judgements of a free name for the first item of SESSION's target
+// (each looks at the name of every item there); negative when one is not accepted.
+double JudgeNames(wbhost::session::HostSession& session) {
+    const auto rules =
+        qv::com::QueryAs<IqxProjectItemUI>(TargetOf(session).Children().front()->Object());
+    if (!rules)
+        return -1;
+    const double start = ThreadSeconds();
+    for (int i = 0; i < 10; ++i) {
+        if (rules->ValidateNewName(u"A name nobody has") != S_OK)
+            return -1;
+    }
+    return ThreadSeconds() - start;
+}
+
+// A rename judged in a target of 1,000 and of 10,000 items: the time per item of the target.
+void BM_ValidateNewName(benchmark::State& state) {
+    const auto small = OpenScaleProject(kSmall, true, nullptr);
+    const auto large = OpenScaleProject(kLarge, true, nullptr);
+    if (!small || !large) {
+        state.SkipWithError("the project does not open");
+        return;
+    }
+    Pairs& pairs = g_pairs["judge a new name (ten times)"];
+    bool smallFirst = true;
+    for (auto _ : state) {
+        const double firstSeconds = JudgeNames(smallFirst ? *small : *large);
+        const double secondSeconds = JudgeNames(smallFirst ? *large : *small);
+        const double smallSeconds = smallFirst ? firstSeconds : secondSeconds;
+        const double largeSeconds = smallFirst ? secondSeconds : firstSeconds;
+        smallFirst = !smallFirst;
+        if (smallSeconds < 0 || largeSeconds < 0) {
+            state.SkipWithError("the name is not accepted");
+            return;
+        }
+        pairs.Add(smallSeconds, largeSeconds);
+    }
+    pairs.Report(state);
+}
+
 // Few iterations, each long; the medians of the pairs are what the summary compares.
 BENCHMARK(BM_OpenAndBind)->Unit(benchmark::kMillisecond)->Iterations(6);
 BENCHMARK(BM_RenameConnector)->Arg(0)->Arg(1)->Unit(benchmark::kMillisecond)->Iterations(10);
 BENCHMARK(BM_CreateMultiple)->Unit(benchmark::kMillisecond)->Iterations(6);
+BENCHMARK(BM_ValidateNewName)->Unit(benchmark::kMillisecond)->Iterations(10);
 
 } // namespace
 

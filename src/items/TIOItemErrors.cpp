@@ -51,7 +51,7 @@ HRESULT TIOInstanceItemUI::GetErrorInformation(std::u16string* text, bool* missi
             // A missing resource is an error whether or not its text is asked for.
             const HRESULT physical = CheckStatus(IsPhysical());
             message = tio::ModuleString(physical == S_OK ? tio::kStrMissingPhysicalMessage
-                                                             : tio::kStrMissingMessage);
+                                                         : tio::kStrMissingMessage);
         } else {
             auto holders =
                 node ? node.ReservingItems(HostItem()) : std::vector<ComPtr<IwbProjectItem>>{};
@@ -100,7 +100,7 @@ HRESULT TIOInstanceItemUI::GetErrorCategory(BSTR* text, BSTR* title, int32_t* ca
     // Without an error the text says that there is nothing to explain.
     if (found == 3)
         message = tio::ModuleString(physical == S_OK ? tio::kStrNoErrorInfoPhysical
-                                                         : tio::kStrNoErrorInfo);
+                                                     : tio::kStrNoErrorInfo);
     if (const HRESULT put = qv::com::PutBstr(message, text); FAILED(put))
         return put;
     if (const HRESULT put = qv::com::PutBstr(tio::ModuleString(kTitles[found]), title);

@@ -4,9 +4,36 @@
 #include "com/CallGuard.h"
 #include "resource_tree/ListText.h"
 
+#include <initializer_list>
+#include <optional>
+#include <vector>
+
 namespace wbhw {
 
 using qv::host::ResourceNode;
+
+namespace {
+
+// The "FPGAHost" children of the node that the relative paths of STEPS lead to from TREE, one
+// after the other; nothing when a step finds no node or a query fails.
+std::optional<std::vector<ResourceNode>>
+HostsBelow(const ResourceNode& tree, std::initializer_list<std::u16string_view> steps) noexcept {
+    std::vector<ResourceNode> hosts;
+    const HRESULT listed = qv::com::GuardCall([&] {
+        ResourceNode at = tree;
+        for (const std::u16string_view step : steps)
+            at = at ? at.Find(step) : ResourceNode();
+        if (!at)
+            return S_FALSE;
+        hosts = at.ChildrenOfType(u"FPGAHost");
+        return S_OK;
+    });
+    if (listed != S_OK)
+        return std::nullopt;
+    return hosts;
+}
+
+} // namespace
 
 HRESULT ReadHostDefinition(const ResourceNode& host, HostDefinition& definition) noexcept {
     return qv::com::GuardCall([&] {
@@ -21,17 +48,10 @@ HRESULT ReadHostDefinition(const ResourceNode& host, HostDefinition& definition)
 
 HRESULT FindHostDefinition(const ResourceNode& tree, std::u16string_view guid,
                            HostDefinition& definition) noexcept {
-    std::vector<ResourceNode> hosts;
-    const HRESULT listed = qv::com::GuardCall([&] {
-        const ResourceNode set = tree ? tree.Find(u"FPGAHostSet") : ResourceNode();
-        if (!set)
-            return S_FALSE;
-        hosts = set.ChildrenOfType(u"FPGAHost");
-        return S_OK;
-    });
-    if (listed != S_OK)
+    const auto hosts = HostsBelow(tree, {u"FPGAHostSet"});
+    if (!hosts)
         return S_FALSE;
-    for (const ResourceNode& host : hosts) {
+    for (const ResourceNode& host : *hosts) {
         std::optional<std::u16string> id;
         if (const HRESULT hr = qv::com::GuardCall([&] {
                 id = host.Attribute(u"GUID");
@@ -47,18 +67,10 @@ HRESULT FindHostDefinition(const ResourceNode& tree, std::u16string_view guid,
 
 bool IsHostSupported(const HostDefinition& required, const ResourceNode& tree,
                      std::u16string_view path) noexcept {
-    std::vector<ResourceNode> hosts;
-    const HRESULT listed = qv::com::GuardCall([&] {
-        const ResourceNode node = tree ? tree.Find(path) : ResourceNode();
-        const ResourceNode list = node ? node.Find(u"SupportedFPGAHostList") : ResourceNode();
-        if (!list)
-            return S_FALSE;
-        hosts = list.ChildrenOfType(u"FPGAHost");
-        return S_OK;
-    });
-    if (listed != S_OK)
+    const auto hosts = HostsBelow(tree, {path, u"SupportedFPGAHostList"});
+    if (!hosts)
         return true;
-    for (const ResourceNode& host : hosts) {
+    for (const ResourceNode& host : *hosts) {
         HostDefinition offered;
         if (ReadHostDefinition(host, offered) != S_OK)
             return true;

@@ -87,7 +87,7 @@ protected:
 
 TEST_F(ChildValidationTest, ATargetGoesBelowTheHostsItsClassSupports) {
     int32_t allowed = 7;
-    EXPECT_EQ(Place(kRack, &allowed), S_FALSE); // Linux on PCIe, as entry A asks
+    EXPECT_EQ(Place(kRack, &allowed), S_FALSE);  // Linux on PCIe, as entry A asks
     EXPECT_EQ(Place(kAnyOs, &allowed), S_FALSE); // "All" never blocks an attribute
     // Found in any case of its GUID, but no entry matches: A wants Linux or Mac, B a slot the
     // desk does not name.

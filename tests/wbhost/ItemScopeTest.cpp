@@ -37,10 +37,9 @@ protected:
                                    std::u16string(resource) +
                                    u"</Value>\n</Attribute>\n</AttributeSet>\n";
         ComPtr<ProjectItem> made;
-        EXPECT_EQ(session.Project()->CreateItem(parent, tio::kIOItemType, std::move(name),
-                                                {{u"tioAttrBag", Property{Property::Kind::String,
-                                                                          bag, 0}}},
-                                                &made),
+        EXPECT_EQ(session.Project()->CreateItem(
+                      parent, tio::kIOItemType, std::move(name),
+                      {{u"tioAttrBag", Property{Property::Kind::String, bag, 0}}}, &made),
                   S_OK);
         return made.Get();
     }
