@@ -29,8 +29,8 @@ using DumpFn = int32_t(const WBRefNum*, HS, HS, uint8_t*);
 using IsReservedFn = int32_t(const WBRefNum*, HS, HS, uint8_t, uint32_t*, uint8_t*);
 using ProtocolsFn = int32_t(const WBRefNum*, HS, WBHandle*, uint8_t*);
 using EditFn = int32_t(const WBRefNum*, HS, HS, uint8_t*);
-using SetAttributesFn = int32_t(const WBRefNum*, WBHandle*);
-using SetOnMultipleFn = int32_t(WBHandle*, WBHandle*);
+using SetAttributesFn = int32_t(const WBRefNum*, const WBHandle*);
+using SetOnMultipleFn = int32_t(const WBHandle*, const WBHandle*);
 using GetResourceFn = int32_t(const WBRefNum*, void*, HS, HS, int32_t*);
 
 constexpr const char* kBoard = R"(<Target>
