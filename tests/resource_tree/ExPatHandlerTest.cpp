@@ -1,5 +1,9 @@
-// The Expat adapter: events in wide strings, whole and split input, exceptions carried out.
+// The Expat adapter: events in wide strings, whole and split input, exceptions carried out, and
+// the way back from the UTF-8 form of documents handed to Expat.
 #include "resource_tree/ExPatHandler.h"
+
+#include "kern/Utf8.h"
+#include "resource_tree/LoaderText.h"
 
 #include <gtest/gtest.h>
 #include <stdexcept>
@@ -40,14 +44,6 @@ TEST(ExPatHandler, DeliversWideEventsWholeOrOneByteAtATime) {
     EXPECT_EQ(bytewise.log, kExpected);
 }
 
-TEST(ExPatHandler, AttributeNamesAreOneKeyRegardlessOfCase) {
-    wbhw::XmlAttributes atts;
-    EXPECT_TRUE(atts.Insert(u"Name", u"first"));
-    EXPECT_FALSE(atts.Insert(u"NAME", u"second"));
-    EXPECT_EQ(atts.Get(u"name"), u"first");
-    EXPECT_EQ(atts.Get(u"absent"), u"");
-}
-
 TEST(ExPatHandler, HandlerExceptionIsRethrownAfterExpatReturns) {
     Recorder r;
     r.throwOnStart = true;
@@ -61,6 +57,14 @@ TEST(ExPatHandler, ReportsErrorWithLineAndColumn) {
     EXPECT_EQ(r.CurrentLine(), 2u);
     EXPECT_EQ(r.CurrentColumn(), 7u);
     EXPECT_FALSE(r.ErrorString().empty());
+}
+
+TEST(LoaderText, WellFormedTextsComeBackFromUtf8Unchanged) {
+    std::u16string text = u"prefix ";
+    text += std::u16string(100, u'a') + u"\u00E9\U0001F600 tail";
+    EXPECT_EQ(wbhw::FromUtf8Lenient(qv::kern::WideToStandardUtf8(text)), text);
+    // Undecodable bytes become U+FFFD, and what was decoded before them stays.
+    EXPECT_EQ(wbhw::FromUtf8Lenient("ok\xFF"), u"ok\uFFFD");
 }
 
 } // namespace

@@ -69,6 +69,7 @@ TEST(ParseElement, LocalizedTextsPickTheLanguageAndKeepTheList) {
         <Label localize="true">eng=Input, deu=Eingang , fra = Entree</Label>
         <Other localize="1">fra=Sortie</Other>
         <Plain localize="no">eng=x</Plain>
+        <L>plain</L><L localize="yes">eng=English</L>
     </Top>)";
     LoaderSettings german;
     german.language = u"deu";
@@ -82,17 +83,14 @@ TEST(ParseElement, LocalizedTextsPickTheLanguageAndKeepTheList) {
     EXPECT_EQ(de->Find(u"Plain")->Kind(), EntryKind::Text);
     // Readers that stop at the NUL see the chosen text.
     EXPECT_EQ(std::u16string(de->TextAt(u"Label")->c_str()), u"Eingang");
+    // A localized text overwrites a plain one of its name.
+    EXPECT_EQ(de->Find(u"L")->Kind(), EntryKind::LocalizedText);
+    EXPECT_EQ(std::u16string(de->TextAt(u"L")->c_str()), u"English");
 
     LoaderSettings japanese;
     japanese.language = u"jpn";
     auto fallback = Load(doc, &japanese);
     EXPECT_EQ(std::u16string(fallback->TextAt(u"Label")->c_str()), u"Input");
-}
-
-TEST(ParseElement, ALocalizedTextOverwritesAPlainOne) {
-    auto root = Load(uR"(<Top><L>plain</L><L localize="yes">eng=English</L></Top>)");
-    EXPECT_EQ(root->Find(u"L")->Kind(), EntryKind::LocalizedText);
-    EXPECT_EQ(std::u16string(root->TextAt(u"L")->c_str()), u"English");
 }
 
 } // namespace

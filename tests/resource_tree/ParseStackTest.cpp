@@ -64,54 +64,37 @@ TEST(ParseStack, OrderedAndNextControlTheEntryOrder) {
     EXPECT_FALSE(unordered->IsOrdered());
 }
 
-TEST(ParseStack, SameNamedNodesMergeUnlessReplaced) {
+TEST(ParseStack, SameNamedNodesMergeUnlessReplacedAndTextsKeepTheLast) {
+    // Another tag replaces the node.
     auto root = Load(uR"(<Top>
         <Module name="m"><A>1</A><B>1</B></Module>
         <Module name="M"><A>2</A><C>2</C></Module>
         <Other name="m"><D/></Other>
     </Top>)");
-    // Another tag replaces the node.
-    ResTreeNode* m = ChildOf(*root, u"m");
-    ASSERT_NE(m, nullptr);
-    EXPECT_EQ(m->Type(), u"Other");
+    ASSERT_NE(ChildOf(*root, u"m"), nullptr);
+    EXPECT_EQ(ChildOf(*root, u"m")->Type(), u"Other");
 
-    // (Group is no list type: its texts are unique by name.)
-    auto merged = Load(uR"(<Top>
+    // (Group is no list type: its texts are unique by name.) "replace" rebuilds its own element
+    // only: the later "b" is merged as the document asks.
+    root = Load(uR"(<Top><V>1</V><V>2</V>
         <Group name="m"><A>1</A><B>1</B></Group>
         <Group name="m"><A>2</A><C>2</C></Group>
+        <Group name="r"><A>1</A><B>1</B></Group>
+        <Group name="b"><X>1</X></Group>
+        <Group name="r" replace="true"><A>2</A><W>1</W><W>2</W></Group>
+        <Group name="b"><Y>2</Y></Group>
     </Top>)");
-    m = ChildOf(*merged, u"m");
+    EXPECT_EQ(TextOf(*root, u"V"), u"2");
+    ResTreeNode* m = ChildOf(*root, u"m");
     EXPECT_EQ(TextOf(*m, u"A"), u"2");
     EXPECT_EQ(TextOf(*m, u"B"), u"1");
     EXPECT_EQ(TextOf(*m, u"C"), u"2");
-
-    auto replaced = Load(uR"(<Top>
-        <Group name="m"><A>1</A><B>1</B></Group>
-        <Group name="m" replace="true"><A>2</A></Group>
-    </Top>)");
-    m = ChildOf(*replaced, u"m");
-    EXPECT_EQ(TextOf(*m, u"A"), u"2");
-    EXPECT_EQ(TextOf(*m, u"B"), u"<absent>");
-}
-
-TEST(ParseStack, ReplaceAppliesToItsElementNotToLaterSiblings) {
-    auto root = Load(uR"(<Top>
-        <Group name="a"><X>1</X></Group>
-        <Group name="b"><X>1</X></Group>
-        <Group name="a" replace="true"><Y>2</Y></Group>
-        <Group name="b"><Y>2</Y></Group>
-    </Top>)");
-    EXPECT_EQ(TextOf(*ChildOf(*root, u"a"), u"X"), u"<absent>");
-    // Merged as the document asks, not rebuilt because an earlier sibling said "replace".
+    ResTreeNode* r = ChildOf(*root, u"r");
+    EXPECT_EQ(TextOf(*r, u"A"), u"2");
+    EXPECT_EQ(TextOf(*r, u"B"), u"<absent>");
+    EXPECT_EQ(TextOf(*r, u"W"), u"1");
     EXPECT_EQ(TextOf(*ChildOf(*root, u"b"), u"X"), u"1");
     EXPECT_EQ(TextOf(*ChildOf(*root, u"b"), u"Y"), u"2");
-}
-
-TEST(ParseStack, TextsOfTheSameNameKeepOrOverwrite) {
-    auto root = Load(uR"(<Top><V>1</V><V>2</V>
-        <Group name="m" replace="true"><W>1</W><W>2</W></Group></Top>)");
-    EXPECT_EQ(TextOf(*root, u"V"), u"2");
-    EXPECT_EQ(TextOf(*ChildOf(*root, u"m"), u"W"), u"1");
 }
 
 TEST(ParseStack, XmlTypedElementsCaptureNestedMarkup) {
@@ -220,22 +203,5 @@ TEST(ParseStack, DeeplyNestedElementsStopTheLoadWithAMessage) {
     EXPECT_NE(TextOf(*root, u"XMLParseErrors").find(u"nested deeper than 50"),
               std::u16string::npos);
 }
-
-TEST(ParseStack, ObserversHearOfAWholeLoadOnce) {
-    struct Counter : ResTreeNodeChangeObserver {
-        int calls = 0;
-        uint32_t bits = 0;
-        void OnNodeChanged(ResTreeNode*, uint32_t changes, uint32_t) override {
-            ++calls;
-            bits |= changes;
-        }
-    } counter;
-    ResTreeNode root(u"", u"", false);
-    root.AddObserver(&counter, kAllChanges, 0);
-    EXPECT_EQ(root.ParseText(u"<Top><A/><B/><M name='m'/></Top>", false), 0);
-    EXPECT_EQ(counter.calls, 1);
-    EXPECT_EQ(counter.bits, kValueAdded | kChildAdded);
-}
-
 } // namespace
 } // namespace wbhw

@@ -93,6 +93,12 @@ TEST(ResTreeObservers, ObserversLeavingOrJoiningDuringAPass) {
     node.AddText(node.End(), u"b", u"");
     EXPECT_EQ(leaver.calls.size(), 1u);
     EXPECT_EQ(joiner.calls.size(), 1u);
+    // Removal by cookie leaves the observer's other registrations.
+    node.AddObserver(&joiner, kAllChanges, 4);
+    node.RemoveObserver(&joiner, 3);
+    node.AddText(node.End(), u"c", u"");
+    ASSERT_EQ(joiner.calls.size(), 2u);
+    EXPECT_EQ(joiner.calls[1].cookie, 4u);
 }
 
 TEST(ResTreeObservers, ChangesRaisedDuringDeliveryGoOutInAFurtherPass) {
@@ -109,15 +115,13 @@ TEST(ResTreeObservers, ChangesRaisedDuringDeliveryGoOutInAFurtherPass) {
     EXPECT_EQ(recorder.calls[1].changes, kValueAdded);
 }
 
-TEST(ResTreeObservers, RemovingByCookie) {
-    ResTreeNode node(u"", u"Target", false);
+TEST(ResTreeObservers, AWholeLoadIsOneDelivery) {
+    ResTreeNode root(u"", u"", false);
     Recorder recorder;
-    node.AddObserver(&recorder, kAllChanges, 1);
-    node.AddObserver(&recorder, kAllChanges, 2);
-    node.RemoveObserver(&recorder, 1);
-    node.AddText(node.End(), u"a", u"");
+    root.AddObserver(&recorder, kAllChanges, 0);
+    EXPECT_EQ(root.ParseText(u"<Top><A/><B/><M name='m'/></Top>", false), 0);
     ASSERT_EQ(recorder.calls.size(), 1u);
-    EXPECT_EQ(recorder.calls[0].cookie, 2u);
+    EXPECT_EQ(recorder.calls[0].changes, kValueAdded | kChildAdded);
 }
 
 TEST(ResTreeObservers, AncestorAndReservationChangesAreForwarded) {
