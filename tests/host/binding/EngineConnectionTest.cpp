@@ -1,9 +1,10 @@
-// Connections to run-time engines through their function tables, the shared connection list, and
-// the table version classes.
+// Connections to run-time engines through their function tables, the shared connection list, the
+// table version classes, and the shortened version names tried after the full text.
 #include "host/binding/EngineConnection.h"
 
 #include "FakeRuntimes.h"
 #include "host/binding/ConnectionList.h"
+#include "host/binding/VersionName.h"
 #include "host/binding/WBCIntFunctions.h"
 
 #include <array>
@@ -171,6 +172,21 @@ TEST_F(ConnectionListTest, ALateDuplicateIsDiscardedAndAFailedOpenCountsNothing)
 
     EXPECT_EQ(list_.Acquire("9.0", 2, [] { return std::unique_ptr<rt::EngineConnection>(); }),
               nullptr);
+}
+
+TEST(VersionName, ReleaseSuffixesShortenToMajorMinorAndLongNamesAreNotKept) {
+    EXPECT_EQ(rt::ShortVersionName("16.0.0f1"), "16.0");
+    EXPECT_EQ(rt::ShortVersionName("8.6b3"), "8.6");
+    EXPECT_EQ(rt::ShortVersionName("2020.1.3"), "2020.1");
+    // Texts without a shortening point have none.
+    EXPECT_EQ(rt::ShortVersionName(""), std::nullopt);
+    EXPECT_EQ(rt::ShortVersionName("16.0"), std::nullopt);
+    EXPECT_EQ(rt::ShortVersionName("8.2f"), std::nullopt) << "the suffix digit must be in the text";
+    EXPECT_EQ(rt::ShortVersionName("8.2x1"), std::nullopt);
+    EXPECT_EQ(rt::ShortVersionName("1234567890.1.2"), std::nullopt)
+        << "the point lies past the scan";
+    EXPECT_EQ(rt::StoredVersionName("12345678901"), "12345678901");
+    EXPECT_EQ(rt::StoredVersionName("123456789012"), "");
 }
 
 } // namespace

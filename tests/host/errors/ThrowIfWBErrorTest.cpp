@@ -1,6 +1,8 @@
-// The check after host calls and the host-array checks: what they raise and from where.
+// The check after host calls and the host-array checks: what they raise and from where; host
+// errors as the statuses of the exported functions.
 #include "host/errors/ThrowIfWBError.h"
 
+#include "host/errors/HostErrorToHResult.h"
 #include "host/errors/WBErrorException.h"
 
 #include <gtest/gtest.h>
@@ -8,6 +10,7 @@
 
 using qv::host::errors::CheckArrayIndex;
 using qv::host::errors::CheckNewArraySize;
+using qv::host::errors::HostErrorToHResult;
 using qv::host::errors::ThrowIfNoHandle;
 using qv::host::errors::ThrowIfWBError;
 using qv::host::errors::WBErrorException;
@@ -54,6 +57,17 @@ TEST(HostArrayChecks, BoundsAndSizes) {
               "Error Code: 1 (00000001): Invalid new_size for array.");
     EXPECT_EQ(MessageOf([] { ThrowIfNoHandle(nullptr); }),
               "Error Code: 2 (00000002): The host ran out of memory.");
+}
+
+TEST(HostErrorToHResult, TableAndEverythingElseAsGeneralFailure) {
+    EXPECT_EQ(HostErrorToHResult(0), 0);
+    EXPECT_EQ(static_cast<uint32_t>(HostErrorToHResult(1)), 0x80070057u);
+    EXPECT_EQ(static_cast<uint32_t>(HostErrorToHResult(2)), 0x8007000Eu);
+    EXPECT_EQ(static_cast<uint32_t>(HostErrorToHResult(7)), 0x80030002u);
+    EXPECT_EQ(static_cast<uint32_t>(HostErrorToHResult(53)), 0x80004001u);
+    for (const int32_t other : {-1, 3, 42, 54, 0x7FFFFFFF}) {
+        EXPECT_EQ(static_cast<uint32_t>(HostErrorToHResult(other)), 0x80004005u) << other;
+    }
 }
 
 } // namespace
