@@ -39,17 +39,20 @@ private:
     HostFunctionSlot& slot_;
 };
 
+using kern::osdep::ModuleIdentity;
+
 struct SlotBinding {
     void* module;
     void* address;
+    uintptr_t base;
 };
 
-// The module and address of an entry as one consistent pair.
+// The module, address and load address of an entry as one consistent set.
 SlotBinding ReadSlot(const HostFunctionSlot& slot) noexcept {
     for (;;) {
         const uint32_t before = slot.sequence.load();
         if ((before & 1) == 0) {
-            const SlotBinding binding{slot.module.load(), slot.address.load()};
+            const SlotBinding binding{slot.module.load(), slot.address.load(), slot.base.load()};
             if (slot.sequence.load() == before) {
                 return binding;
             }
@@ -58,74 +61,90 @@ SlotBinding ReadSlot(const HostFunctionSlot& slot) noexcept {
     }
 }
 
-void* Bind(HostFunctionSlot& slot, const char* name, void* module, uint64_t stamp) noexcept {
+// Fills an entry the caller owns (under its rewrite guard) with MODULE.
+void* Fill(HostFunctionSlot& slot, void* address, void* module,
+           const ModuleIdentity& identity) noexcept {
+    slot.address.store(address);
+    slot.module.store(module);
+    slot.base.store(identity.base);
+    slot.stamp.store(identity.stamp);
+    return address;
+}
+
+void* Bind(HostFunctionSlot& slot, const char* name, void* module,
+           const ModuleIdentity& identity) noexcept {
     // The lookup runs before the entry is taken: it may be slow, and readers wait meanwhile.
     void* const address = kern::osdep::ModuleExport(module, name);
     const SlotRewrite rewrite(slot);
-    slot.address.store(address);
-    slot.module.store(module);
-    slot.stamp.store(stamp);
-    return address;
+    return Fill(slot, address, module, identity);
+}
+
+// True when the entry's module is gone, or its handle now names another load (a handle is handed
+// out again after a dlclose): nobody can use the entry as it stands.
+bool IsStale(const HostFunctionSlot& slot, const SlotBinding& binding) noexcept {
+    if (!kern::osdep::IsModuleLoaded(binding.module))
+        return true;
+    return kern::osdep::IdentifyModule(binding.module) !=
+           ModuleIdentity{slot.stamp.load(), binding.base};
 }
 
 // The first entry that decides answers: one already bound to this stamp or this module, or a free
 // one we manage to claim. Null when none decides (or the module lacks the export).
-void* WalkCache(HostFunction& function, void* module, uint64_t stamp) noexcept {
+void* WalkCache(HostFunction& function, void* module, const ModuleIdentity& identity) noexcept {
     for (HostFunctionSlot& slot : function.slots) {
         const uint64_t slotStamp = slot.stamp.load();
-        if (slotStamp == stamp) {
+        if (slotStamp == identity.stamp) {
             const SlotBinding binding = ReadSlot(slot);
-            if (binding.module == module) {
+            if (binding.module == module && binding.base == identity.base) {
                 return binding.address;
             }
-            return Bind(slot, function.name, module, stamp);
+            return Bind(slot, function.name, module, identity);
         }
         if (slot.module.load() == module) {
-            return Bind(slot, function.name, module, stamp);
+            return Bind(slot, function.name, module, identity);
         }
         uint64_t expected = 0;
-        if (slot.stamp.compare_exchange_strong(expected, stamp)) {
-            return Bind(slot, function.name, module, stamp);
+        if (slot.stamp.compare_exchange_strong(expected, identity.stamp)) {
+            return Bind(slot, function.name, module, identity);
         }
     }
     return nullptr;
 }
 
-// Takes over the entry of a module that has been unloaded since it was cached.
-void* ReclaimUnloaded(HostFunction& function, void* module, uint64_t stamp) noexcept {
+// Takes over the entry of a module that has been unloaded since it was cached (or whose handle
+// now names another load).
+void* ReclaimUnloaded(HostFunction& function, void* module,
+                      const ModuleIdentity& identity) noexcept {
     for (HostFunctionSlot& slot : function.slots) {
         const SlotBinding binding = ReadSlot(slot);
         void* const old = binding.module;
-        if (old == module && slot.stamp.load() == stamp) {
+        if (old == module && slot.stamp.load() == identity.stamp && binding.base == identity.base) {
             return binding.address;
         }
-        if (old == nullptr || kern::osdep::IsModuleLoaded(old)) {
+        if (old == nullptr || !IsStale(slot, binding)) {
             continue;
         }
         // Claimed only if the entry still holds the unloaded module once we own it; taking it
         // under the rewrite guard keeps readers from pairing our module with the old address.
         void* const address = kern::osdep::ModuleExport(module, function.name);
         const SlotRewrite rewrite(slot);
-        if (slot.module.load() != old) {
+        if (slot.module.load() != old || slot.base.load() != binding.base) {
             continue;
         }
-        slot.address.store(address);
-        slot.module.store(module);
-        slot.stamp.store(stamp);
-        return address;
+        return Fill(slot, address, module, identity);
     }
     return nullptr;
 }
 
 void* ResolveIn(HostFunction& function, void* module) noexcept {
-    const uint64_t stamp = kern::osdep::ModuleStamp(module);
-    if (void* const address = WalkCache(function, module, stamp)) {
+    const ModuleIdentity identity = kern::osdep::IdentifyModule(module);
+    if (void* const address = WalkCache(function, module, identity)) {
         return address;
     }
-    if (void* const address = ReclaimUnloaded(function, module, stamp)) {
+    if (void* const address = ReclaimUnloaded(function, module, identity)) {
         return address;
     }
-    return WalkCache(function, module, stamp);
+    return WalkCache(function, module, identity);
 }
 
 } // namespace

@@ -7,14 +7,16 @@
 
 namespace qv::host::rt {
 
-// One cache entry: a runtime module, its stamp and the function's address in it. A stamp of 0
-// marks a free entry. `sequence` is odd while the entry is being rewritten, so that a reader never
-// pairs one module with another module's address.
+// One cache entry: a runtime module, its stamp, where it was loaded and the function's address in
+// it. A stamp of 0 marks a free entry. `sequence` is odd while the entry is being rewritten, so
+// that a reader never pairs one module with another module's address.
 struct HostFunctionSlot {
     std::atomic<void*> module{nullptr};
     std::atomic<uint64_t> stamp{0};
     std::atomic<void*> address{nullptr};
     std::atomic<uint32_t> sequence{0};
+    // The module's load address: a handle handed out again after a dlclose names a new load.
+    std::atomic<uintptr_t> base{0};
 };
 
 // The descriptor of one bound host function: eight cache entries (one per runtime module seen)

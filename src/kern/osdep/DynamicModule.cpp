@@ -162,15 +162,20 @@ bool IsModuleLoaded(const void* handle) noexcept {
     return Probe(handle, false).loaded;
 }
 
-uint64_t ModuleStamp(const void* handle) noexcept {
-    auto stampOf = [](const void* module) -> uint64_t {
-        const uint32_t prefix = Probe(module, true).buildId;
-        return prefix != 0 ? prefix : 1;
+ModuleIdentity IdentifyModule(const void* handle) noexcept {
+    auto identify = [](const void* module) {
+        const ModuleProbe probe = Probe(module, true);
+        return ModuleIdentity{probe.buildId != 0 ? probe.buildId : 1u,
+                              probe.loaded ? static_cast<uintptr_t>(probe.base) : 0u};
     };
-    // The executable never goes away, so its stamp cannot change: the common case of a host that
-    // is itself the runtime skips the walk.
-    static const uint64_t mainStamp = stampOf(MainModule());
-    return handle == MainModule() ? mainStamp : stampOf(handle);
+    // The executable never goes away, so it cannot change: the common case of a host that is
+    // itself the runtime skips the walk.
+    static const ModuleIdentity main = identify(MainModule());
+    return handle == MainModule() ? main : identify(handle);
+}
+
+uint64_t ModuleStamp(const void* handle) noexcept {
+    return IdentifyModule(handle).stamp;
 }
 
 void* ModuleExport(void* handle, const char* name) noexcept {

@@ -50,6 +50,16 @@ bool IsModuleLoaded(const void* handle) noexcept;
 // note reads 0, or the handle is not a loaded module. Never 0, so 0 can mean "no module".
 uint64_t ModuleStamp(const void* handle) noexcept;
 
+// Where a loaded module is: its stamp and the address it was loaded at (0 when the handle is not a
+// loaded module). A handle that was closed may be handed out again by a later load, of the same
+// file at another address or of another file: the pair tells such a load from the earlier one.
+struct ModuleIdentity {
+    uint64_t stamp = 1;
+    uintptr_t base = 0;
+    bool operator==(const ModuleIdentity&) const = default;
+};
+ModuleIdentity IdentifyModule(const void* handle) noexcept;
+
 // The address of the export `name` defined by the module itself (not by one of its dependencies
 // or by another global module), or null when it has none. `handle` must be loaded.
 void* ModuleExport(void* handle, const char* name) noexcept;

@@ -26,13 +26,9 @@ using AnswerFn = int32_t();
     throw std::runtime_error(message);
 }
 
-// Disabled: it fails today. After a dlclose the dynamic linker may hand the same handle to the
-// next load (of the same file at another address, or of another file), and the cache takes a
-// handle with its stamp for the module itself: a reloaded module is called at its old address
-// (a wrong answer or a crash), and an entry whose handle now names another loaded module is never
-// taken over (no entry left for the eighth thread). Entries must also remember where the module
-// was loaded; enable this test with that change.
-TEST(HostFunctionConcurrency, DISABLED_ThreadsClaimEntriesWhileModulesLoadAndUnload) {
+// A closed handle may be handed out again by the next load (of the same file at another address,
+// or of another file): the cache must tell such a load from the module it had bound.
+TEST(HostFunctionConcurrency, ThreadsClaimEntriesWhileModulesLoadAndUnload) {
     static rt::BoundFunction<AnswerFn> answer{"FakeAnswer"};
     constexpr int kThreads = static_cast<int>(rt::HostFunction::kSlotCount);
     constexpr int kModules = 9; // one more than there are entries
