@@ -200,6 +200,28 @@ struct Pairs {
 };
 std::map<std::string, Pairs> g_pairs;
 
+// Measures SMALL and LARGE (processor seconds, negative on failure) once per iteration into
+// PAIRS. Each size goes first every other time: the one measured second finds the caches filled
+// by the other. False, with the benchmark skipped for WHY, when a measurement fails.
+template <class Small, class Large>
+bool MeasureInTurns(benchmark::State& state, Pairs& pairs, Small&& small, Large&& large,
+                    const char* why) {
+    bool smallFirst = true;
+    for (auto _ : state) {
+        const double firstSeconds = smallFirst ? small() : large();
+        const double secondSeconds = smallFirst ? large() : small();
+        const double smallSeconds = smallFirst ? firstSeconds : secondSeconds;
+        const double largeSeconds = smallFirst ? secondSeconds : firstSeconds;
+        smallFirst = !smallFirst;
+        if (smallSeconds < 0 || largeSeconds < 0) {
+            state.SkipWithError(why);
+            return false;
+        }
+        pairs.Add(smallSeconds, largeSeconds);
+    }
+    return true;
+}
+
 void BM_OpenAndBind(benchmark::State& state) {
     Pairs& pairs = g_pairs["open and bind"];
     double bound = 0;
@@ -258,21 +280,10 @@ void BM_RenameConnector(benchmark::State& state) {
     }
     Pairs& pairs = g_pairs[withItems ? "rename the connector" : "rename the connector, no items"];
     const uint64_t before = large.tree->Notifications();
-    bool smallFirst = true;
-    for (auto _ : state) {
-        // Each size goes first every other time: the one measured second finds the caches
-        // filled by the other.
-        const double firstSeconds = smallFirst ? small.Rename() : large.Rename();
-        const double secondSeconds = smallFirst ? large.Rename() : small.Rename();
-        const double smallSeconds = smallFirst ? firstSeconds : secondSeconds;
-        const double largeSeconds = smallFirst ? secondSeconds : firstSeconds;
-        smallFirst = !smallFirst;
-        if (smallSeconds < 0 || largeSeconds < 0) {
-            state.SkipWithError("the connector cannot be renamed");
-            return;
-        }
-        pairs.Add(smallSeconds, largeSeconds);
-    }
+    if (!MeasureInTurns(
+            state, pairs, [&] { return small.Rename(); }, [&] { return large.Rename(); },
+            "the connector cannot be renamed"))
+        return;
     pairs.Report(state);
     state.counters["notifications_per_rename_10000"] =
         static_cast<double>(large.tree->Notifications() - before) /
@@ -357,19 +368,10 @@ void BM_ValidateNewName(benchmark::State& state) {
         return;
     }
     Pairs& pairs = g_pairs["judge a new name (ten times)"];
-    bool smallFirst = true;
-    for (auto _ : state) {
-        const double firstSeconds = JudgeNames(smallFirst ? *small : *large);
-        const double secondSeconds = JudgeNames(smallFirst ? *large : *small);
-        const double smallSeconds = smallFirst ? firstSeconds : secondSeconds;
-        const double largeSeconds = smallFirst ? secondSeconds : firstSeconds;
-        smallFirst = !smallFirst;
-        if (smallSeconds < 0 || largeSeconds < 0) {
-            state.SkipWithError("the name is not accepted");
-            return;
-        }
-        pairs.Add(smallSeconds, largeSeconds);
-    }
+    if (!MeasureInTurns(
+            state, pairs, [&] { return JudgeNames(*small); }, [&] { return JudgeNames(*large); },
+            "the name is not accepted"))
+        return;
     pairs.Report(state);
 }
 
