@@ -6,15 +6,15 @@
 
 namespace wbhw {
 
-HRESULT BaseItemUI::DropAllowed(IUnknown* dragged) {
+HRESULT BaseItemUI::DropAllowed(IUnknown* dragged, IwbProjectItem*) {
     if (dragged == nullptr || !qv::com::QueryAs<IqxDragData>(dragged))
         return S_FALSE;
     return qv::com::GuardCall([&] { return CheckDropCompatibility(dragged); });
 }
 
-HRESULT BaseItemUI::Drop(IUnknown*, int32_t* handled) {
-    if (handled != nullptr)
-        *handled = 1;
+HRESULT BaseItemUI::Drop(int32_t, int32_t, int32_t, int32_t, uint32_t, uint32_t* effect) {
+    if (effect != nullptr)
+        *effect = 1;
     return S_OK;
 }
 

@@ -14,18 +14,25 @@ namespace wbhw {
 
 class BaseItemUI : public CqxProjectItemUI,
                    public IwbProjectDragDrop,
+                   public IwbProjectDragDropped,
                    public IwbProjectItemObserver,
                    public IwbProjectCutCopyPaste3 {
 public:
     using Interfaces =
-        CqxProjectItemUI::Interfaces::Append<IwbProjectDragDrop, IwbProjectItemObserver,
+        CqxProjectItemUI::Interfaces::Append<IwbProjectDragDrop, IwbProjectDragDropped,
+                                             IwbProjectItemObserver,
                                              IwbProjectCutCopyPaste3>;
 
     // Refuses without a dragged object or one that is not the framework's drag data; otherwise
     // the base's compatibility check decides.
-    HRESULT DropAllowed(IUnknown* dragged) override;
-    // Leaves the drop to the framework: answers 0 and sets HANDLED to 1.
-    HRESULT Drop(IUnknown* dragged, int32_t* handled) override;
+    HRESULT DropAllowed(IUnknown* dragged, IwbProjectItem* target) override;
+    // Leaves the drop to the framework: answers 0 and sets EFFECT to 1.
+    HRESULT Drop(int32_t first, int32_t second, int32_t third, int32_t fourth, uint32_t effects,
+                 uint32_t* effect) override;
+    // The base has nothing to do once dropped.
+    HRESULT Dropped() override { return S_OK; }
+    // The base lets every item be cut.
+    HRESULT QueryCanCut() override { return S_OK; }
     // The base has nothing to follow: every event is taken.
     HRESULT OnProjectItemEvents(uint32_t, const WbProjectItemEvent*) override { return S_OK; }
     // Remembers whether KEEPSOURCE was non-zero.

@@ -12,6 +12,7 @@
 #include "items/TIOItemInterfaces.h"
 
 #include <memory>
+#include <optional>
 #include <string>
 
 class ItemResourceContext;
@@ -115,6 +116,23 @@ public:
     HRESULT WantsState() override { return S_FALSE; }
     HRESULT LoadState(IUnknown*) override { return E_NOTIMPL; }
 
+    // The project tree's requests: the commands of the context menu, the properties dialog,
+    // help, removal and cut, and drag and drop.
+    HRESULT ExecuteCommand(const GUID& command) override;
+    HRESULT ShowProperties() override;
+    HRESULT GetHelp(BSTR* path, BSTR* topic, BSTR* localizedContext) override;
+    // A physical item may be neither removed nor cut (S_FALSE).
+    HRESULT QueryCanRemove() override;
+    HRESULT QueryCanCut() override;
+    // S_OK when the item may go under TARGET: a target (or a place below one) that owns a
+    // resource tree, and for a physical item only its own target.
+    HRESULT DropAllowed(IUnknown* dragged, IwbProjectItem* target) override;
+    // Runs the drop program when FOURTH is 0 and EFFECTS allows it; see the effects below.
+    HRESULT Drop(int32_t first, int32_t second, int32_t third, int32_t fourth, uint32_t effects,
+                 uint32_t* effect) override;
+    // Binds to the resource where the drop put the item.
+    HRESULT Dropped() override;
+
 protected:
     TIOInstanceItemUI();
     ~TIOInstanceItemUI() override;
@@ -122,6 +140,9 @@ protected:
     std::u16string InitialIconName() const override;
     HRESULT NotifyOwner() override;
     HRESULT Detach() override;
+    // The select-resource entry (unless the target's tree takes it away or the item is
+    // physical) and, while the item is in error, the explain-error entry.
+    void AddMenuEntries(std::vector<CqxMenuEntry>& entries) override;
 
 private:
     // Reads the bag from "tioAttrBag" (an empty one when absent) and binds to its resource.
@@ -155,6 +176,25 @@ private:
     void IncrementFeatureSetVersion();
     // Watches for the resource at the working set's path to appear below WATCHED (kind 2).
     void WatchForResource(const qv::host::ResourceNode& watched);
+
+    // The dialogs behind the commands, and the drop program.
+    HRESULT RunSelectResourceDialog();
+    HRESULT RunExplainErrorDialog();
+    void RunDropProgram(int32_t first, int32_t second, int32_t third);
+    // The name the item takes when the select-resource dialog moves it from the resource at
+    // OLDPATH to the one at NEWPATH: the new resource's name, unique in the item's scope, when
+    // the item was named after the old one; nothing when it keeps its name.
+    std::optional<std::u16string> FollowingName(const qv::host::ResourceNode& root,
+                                                std::u16string_view oldPath,
+                                                std::u16string_view newPath);
+    // The target that owns the item's resource tree, filling CONTEXT; throws E_FAIL when none.
+    IwbProjectItem* OwningTarget(ItemResourceContext& context) const;
+    // The identifier of the host item's information record, as text.
+    std::u16string ItemIdentifierText() const;
+    // The item's place for the drop program: "NAME.{TYPE}>>" per item above it, then its own.
+    std::u16string DropChainText();
+    // S_OK when the item may go (removal, cut), S_FALSE for a physical item.
+    HRESULT CanGo();
 
     // Appends the compile configuration to OUT (what was built stays when a query throws).
     void BuildCompileConfiguration(std::u16string& out);

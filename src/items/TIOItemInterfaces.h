@@ -84,10 +84,11 @@ struct IwbTIOItemError : IUnknown {
     virtual HRESULT GetErrorCategory(BSTR* text, BSTR* title, int32_t* category) = 0;
 };
 
-// The chain of project items from the item's target down to the item.
+// The chain of project items from the item's target down to its parent.
 struct IwbTIOItemScope : IUnknown {
     static constexpr IID iid = qv::com::ParseGuid("D93F7050-ADF0-41BE-91AF-1007EFBCB369");
 
-    // COUNT entries, the target first: the item types in TYPES and the names in NAMES.
+    // The items above this one, from its target down to its parent: COUNT entries, the item
+    // types in TYPES and the names in NAMES.
     virtual HRESULT GetScope(uint32_t* count, GUID** types, BSTR** names) = 0;
 };

@@ -245,10 +245,13 @@ HRESULT TIOInstanceItemUI::GetScope(uint32_t* count, GUID** types, BSTR** names)
     return GuardCall([&]() -> HRESULT {
         ItemResourceContext context;
         CheckStatus(context.Fill(HostItem(), true));
-        // From the item up to its target (or the project root when it has none).
+        // From the item's parent up to its target (or the project root when it has none); the
+        // item itself closes the chains built from the list.
         std::vector<GUID> chainTypes;
         std::vector<std::u16string> chainNames;
-        for (ComPtr<IwbProjectItem> at = ComPtr<IwbProjectItem>::Share(HostItem()); at;) {
+        ComPtr<IwbProjectItem> start;
+        CheckStatus(HostItem()->GetParent(start.Put()));
+        for (ComPtr<IwbProjectItem> at = start; at;) {
             GUID type{};
             CheckStatus(at->GetTypeGuid(&type));
             chainTypes.insert(chainTypes.begin(), type);

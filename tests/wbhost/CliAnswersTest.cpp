@@ -85,7 +85,7 @@ TEST(CliAnswers, RunLogShowsEveryKindOfValueOnItsOwnLine) {
     ProgramSession session;
     std::ostringstream none;
     wbhost::cli::PrintRuns(session, none);
-    EXPECT_EQ(none.str(), "no programs ran\n");
+    EXPECT_EQ(none.str(), "no programs ran\nhost references: 0 made, 0 still open\n");
 
     session.Record({"/x/private/TIOPropertyMain.gx",
                     "properties",
@@ -100,7 +100,8 @@ TEST(CliAnswers, RunLogShowsEveryKindOfValueOnItsOwnLine) {
                          "    11 = ref 42\n"
                          "  outputs:\n"
                          "    0 = 1\n"
-                         "    1 = \"back\\\\slash\"\n");
+                         "    1 = \"back\\\\slash\"\n"
+                         "host references: 0 made, 0 still open\n");
 }
 
 } // namespace

@@ -121,7 +121,6 @@ void PrintRuns(const runner::ProgramSession& session, std::ostream& out) {
     const std::vector<runner::ProgramRun> runs = session.Runs();
     if (runs.empty()) {
         out << "no programs ran\n";
-        return;
     }
     for (const runner::ProgramRun& run : runs) {
         out << std::filesystem::path(run.path).filename().string() << " (" << run.behaviour
@@ -129,6 +128,10 @@ void PrintRuns(const runner::ProgramSession& session, std::ostream& out) {
         PrintTerminals("inputs", run.inputs, out);
         PrintTerminals("outputs", run.outputs, out);
     }
+    // A reference left open would keep a project object alive behind the project's back.
+    const auto references = session.Ledger().Counts();
+    out << "host references: " << references.made << " made, " << references.open
+        << " still open\n";
 }
 
 } // namespace wbhost::cli

@@ -27,7 +27,8 @@ bool ApplyAnswers(const std::vector<std::string>& files, const std::vector<std::
                   runner::ProgramSession& session, std::string& error);
 
 // Writes every recorded run of SESSION to OUT, one block per run: the program's file name and
-// behaviour, then its inputs and outputs by terminal index. "no programs ran" when none did.
+// behaviour, then its inputs and outputs by terminal index ("no programs ran" when none did),
+// then how many host references the runners made and how many are still open.
 void PrintRuns(const runner::ProgramSession& session, std::ostream& out);
 
 // The text of VALUE as the run log shows it: numbers as they are, texts quoted, lists in

@@ -15,6 +15,10 @@ HRESULT HostProgramImpl::SetInput(uint32_t index, ProgramValue value) {
     if (index >= kTerminalCount) {
         return E_INVALIDARG;
     }
+    if (const HRESULT injected = session_->Ledger().FailureAt(RunnerStep::Input);
+        FAILED(injected)) {
+        return injected;
+    }
     const std::lock_guard hold(lock_);
     inputs_[index] = std::move(value);
     return S_OK;
@@ -56,6 +60,9 @@ HRESULT HostProgramImpl::SetInputStringArray(uint32_t index, const char16_t* con
 }
 
 HRESULT HostProgramImpl::Run() {
+    if (const HRESULT injected = session_->Ledger().FailureAt(RunnerStep::Run); FAILED(injected)) {
+        return injected;
+    }
     return qv::com::GuardCall([&] {
         const std::lock_guard hold(lock_);
         auto outputs =
@@ -72,6 +79,10 @@ HRESULT HostProgramImpl::Run() {
 HRESULT HostProgramImpl::GetOutputInt32(uint32_t index, int32_t* value) {
     if (!value) {
         return E_POINTER;
+    }
+    if (const HRESULT injected = session_->Ledger().FailureAt(RunnerStep::Output);
+        FAILED(injected)) {
+        return injected;
     }
     const std::lock_guard hold(lock_);
     const ProgramValue* output = Output(index);
@@ -92,6 +103,10 @@ HRESULT HostProgramImpl::GetOutputString(uint32_t index, BSTR* value) {
         return E_POINTER;
     }
     *value = nullptr;
+    if (const HRESULT injected = session_->Ledger().FailureAt(RunnerStep::Output);
+        FAILED(injected)) {
+        return injected;
+    }
     return qv::com::GuardCall([&] {
         const std::lock_guard hold(lock_);
         const ProgramValue* output = Output(index);
@@ -110,6 +125,10 @@ HRESULT HostProgramImpl::GetOutputStringList(uint32_t index, BSTR** array, uint3
     }
     *array = nullptr;
     *count = 0;
+    if (const HRESULT injected = session_->Ledger().FailureAt(RunnerStep::Output);
+        FAILED(injected)) {
+        return injected;
+    }
     return qv::com::GuardCall([&] {
         const std::lock_guard hold(lock_);
         const ProgramValue* output = Output(index);

@@ -28,11 +28,16 @@ HRESULT HostProgramRunnerImpl::MakeHostReference(IUnknown* object, uint64_t* ref
     if (!object) {
         return E_POINTER;
     }
+    if (const HRESULT injected = session_->Ledger().FailureAt(RunnerStep::Reference);
+        FAILED(injected)) {
+        return injected;
+    }
     return qv::com::GuardCall([&] {
         const WBRefNum refnum = wbhost::runtime::RefnumTable::Instance().Add(object);
         if (refnum == 0) {
             return E_OUTOFMEMORY;
         }
+        session_->Ledger().ReferenceMade(refnum);
         *reference = refnum;
         return S_OK;
     });
@@ -46,6 +51,7 @@ HRESULT HostProgramRunnerImpl::ReleaseHostReference(uint64_t reference) {
     return qv::com::GuardCall([&] {
         const bool known =
             wbhost::runtime::RefnumTable::Instance().Remove(static_cast<WBRefNum>(reference));
+        session_->Ledger().ReferenceReleased(reference);
         return known ? S_OK : S_FALSE;
     });
 }
@@ -68,6 +74,9 @@ HRESULT HostProgramRunnerImpl::OpenProgram(const char16_t* path, IwbProgram** pr
     *program = nullptr;
     if (!path) {
         return E_POINTER;
+    }
+    if (const HRESULT injected = session_->Ledger().FailureAt(RunnerStep::Open); FAILED(injected)) {
+        return injected;
     }
     return qv::com::GuardCall([&] {
         const std::string file = qv::kern::WideToUtf8(path);

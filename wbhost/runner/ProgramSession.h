@@ -2,6 +2,8 @@
 // non-interactive session, and the log of every run with its inputs.
 #pragma once
 
+#include "runner/RunnerLedger.h"
+
 #include <cstdint>
 #include <map>
 #include <mutex>
@@ -56,11 +58,16 @@ public:
     // The icon names asked for so far.
     std::vector<std::u16string> Icons() const;
 
+    // The references the runners made and the failures they are made to give.
+    RunnerLedger& Ledger() { return ledger_; }
+    const RunnerLedger& Ledger() const { return ledger_; }
+
 private:
     mutable std::mutex lock_;
     std::map<std::string, Terminals> answers_;
     std::vector<ProgramRun> runs_;
     std::vector<std::u16string> icons_;
+    RunnerLedger ledger_;
 };
 
 } // namespace wbhost::runner
