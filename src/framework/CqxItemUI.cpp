@@ -86,6 +86,16 @@ HRESULT CqxItemUI::GetHelp(BSTR* path, BSTR* topic, BSTR* localizedContext) {
     return S_FALSE;
 }
 
+HRESULT CqxItemUI::GetDefaultHelp(BSTR* file, BSTR* topic, uint32_t* kind) {
+    if (!file || !topic || !kind) {
+        return E_POINTER;
+    }
+    *file = nullptr;
+    *topic = nullptr;
+    *kind = 0;
+    return S_FALSE;
+}
+
 HRESULT CqxItemUI::Bind(IwbProjectItem* item) {
     if (!item) {
         return E_INVALIDARG;

@@ -36,6 +36,7 @@ public:
     HRESULT IsValid() override;
     HRESULT Remove() override;
     HRESULT GetHelp(BSTR* path, BSTR* topic, BSTR* localizedContext) override;
+    HRESULT GetDefaultHelp(BSTR* file, BSTR* topic, uint32_t* kind) override;
     // IqxBindable: keeps ITEM as the host item.
     HRESULT Bind(IwbProjectItem* item) override;
     // IqxProjectItemValidator: agrees when PROVIDER is the object that created this item.

@@ -38,4 +38,7 @@ struct IqxItemUI : IUnknown {
     virtual HRESULT Remove() = 0;
     // Help for the item: file PATH, TOPIC and (optional) LOCALIZEDCONTEXT, each a new BSTR.
     virtual HRESULT GetHelp(BSTR* path, BSTR* topic, BSTR* localizedContext) = 0;
+    // The help of the item's type when the item names none: FILE, TOPIC (new BSTRs) and the
+    // KIND of help the host shows; S_FALSE with null texts when the type has none.
+    virtual HRESULT GetDefaultHelp(BSTR* file, BSTR* topic, uint32_t* kind) = 0;
 };

@@ -121,6 +121,8 @@ public:
     HRESULT ExecuteCommand(const GUID& command) override;
     HRESULT ShowProperties() override;
     HRESULT GetHelp(BSTR* path, BSTR* topic, BSTR* localizedContext) override;
+    // The module's own page on basic I/O, shown as help of kind 5.
+    HRESULT GetDefaultHelp(BSTR* file, BSTR* topic, uint32_t* kind) override;
     // A physical item may be neither removed nor cut (S_FALSE).
     HRESULT QueryCanRemove() override;
     HRESULT QueryCanCut() override;

@@ -18,6 +18,7 @@ constexpr std::u16string_view kDefaultResource = u"IOResourceDefault";
 // The module's own help when the tree names none.
 constexpr std::u16string_view kDefaultHelpFile = u"wbfpgaconcepts.chm";
 constexpr std::u16string_view kDefaultHelpTopic = u"Performing_Basic_I_O.html";
+constexpr uint32_t kDefaultHelpKind = 5;
 
 bool Empty(const wbhw::NodeHelp& help) {
     return help.path.empty() && help.topic.empty();
@@ -84,4 +85,19 @@ HRESULT TIOInstanceItemUI::GetHelp(BSTR* path, BSTR* topic, BSTR* localizedConte
         }
     }
     return hr;
+}
+
+HRESULT TIOInstanceItemUI::GetDefaultHelp(BSTR* file, BSTR* topic, uint32_t* kind) {
+    if (file == nullptr || topic == nullptr || kind == nullptr)
+        return E_POINTER;
+    *file = AllocBstr(kDefaultHelpFile);
+    *topic = AllocBstr(kDefaultHelpTopic);
+    *kind = kDefaultHelpKind;
+    if (*file != nullptr && *topic != nullptr)
+        return S_OK;
+    SysFreeString(*file);
+    SysFreeString(*topic);
+    *file = nullptr;
+    *topic = nullptr;
+    return E_OUTOFMEMORY;
 }

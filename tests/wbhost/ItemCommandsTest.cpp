@@ -281,9 +281,15 @@ TEST_F(ItemCommandsTest, HelpFallsBackTwiceAndComesOutBelowTheHostFolder) {
     EXPECT_EQ(help(AddItem(u"B", u"/C0/DIO1")),
               (Help{host + u"/board.chm", u"io.html", u"Tangent I/O"}));
     // Neither: the module's own page, in the host's help folder.
-    EXPECT_EQ(
-        help(AddItem(u"C", u"/DIO0", other.Get())),
-        (Help{host + u"/help/wbfpgaconcepts.chm", u"Performing_Basic_I_O.html", u"Tangent I/O"}));
+    ProjectItem* plain = AddItem(u"C", u"/DIO0", other.Get());
+    EXPECT_EQ(help(plain), (Help{host + u"/help/wbfpgaconcepts.chm", u"Performing_Basic_I_O.html",
+                                 u"Tangent I/O"}));
+    BSTR file = nullptr, topic = nullptr;
+    uint32_t kind = 0;
+    ASSERT_EQ(As<IqxItemUI>(plain)->GetDefaultHelp(&file, &topic, &kind), S_OK);
+    EXPECT_EQ(Text(file), u"wbfpgaconcepts.chm");
+    EXPECT_EQ(Text(topic), u"Performing_Basic_I_O.html");
+    EXPECT_EQ(kind, 5u);
 }
 
 TEST_F(ItemCommandsTest, APhysicalItemIsDroppedOnlyWithinItsTargetAndTheDropProgramGetsItsPlace) {
