@@ -1,6 +1,7 @@
-// Items acted on from the command line as the project tree acts on them: renames judged by the
-// module's name rules, moves within and between targets, and what each item then reports about
-// its error. A refusal leaves the project file byte for byte as it was.
+// The project tree's requests to an item from the command line: its menu, its commands with
+// their dialogs answered from the session, properties, help and the drop check. Each command is
+// a session of its own; what a command changes is saved, what it refuses leaves the file as it
+// was. The item's own rules are tested in ItemCommandsTest.
 #include "CliTestSupport.h"
 #include "cli/ItemCommands.h"
 #include "cli/ProjectCommands.h"
@@ -10,181 +11,141 @@
 using clitest::Options;
 using clitest::ScratchProject;
 using clitest::Slurp;
-using nlohmann::json;
 using namespace wbhost::cli;
 
 namespace {
 
-constexpr const char* kAnalogOnly = R"(<Target>
-  <Line name="AI0"><IOInterface>AnalogInput</IOInterface></Line>
+constexpr const char* kBoard = R"(<Target name="Board">
+  <IOResourceDefault><Help><Path>help/board.chm</Path><Topic>lines.html</Topic></Help></IOResourceDefault>
+  <Connector name="C0">
+    <DigitalLine name="DIO0"><DisplayName>DIO0</DisplayName>
+      <AttributeSet><Attribute name="Direction"><Value>Input</Value></Attribute></AttributeSet>
+    </DigitalLine>
+    <DigitalLine name="DIO1"><DisplayName>DIO1</DisplayName></DigitalLine>
+  </Connector>
 </Target>
 )";
 
 class CliItemCommands : public ::testing::Test {
 protected:
     void SetUp() override {
-        ASSERT_EQ(Must([&](std::ostream& out, std::ostream& err) {
-                      return RunProjectNew(Options(), p.path,
-                                           {"T=" + p.description, "U=" + p.description,
-                                            "V=" + p.scratch.Write("v.xml", kAnalogOnly)},
-                                           false, out, err);
-                  }),
-                  0);
-    }
-    template <class Work> int Must(Work&& work) {
-        const int exit = p.Run(work);
-        EXPECT_EQ(exit, 0) << p.err.str();
-        return exit;
-    }
-    void Add(const std::string& target, const std::string& resource, const std::string& name) {
-        Must([&](std::ostream& out, std::ostream& err) {
-            return RunAddItem(Options(), p.path, {target, resource, name}, out, err);
-        });
-    }
-    int Item(const std::string& target, const std::string& item, const std::string& action,
-             std::vector<std::string> arguments, std::map<std::string, std::string> options = {}) {
-        return p.Run([&](std::ostream& out, std::ostream& err) {
-            return RunItem(Options(), p.path, {target, item, action, arguments, options}, out, err);
-        });
-    }
-    // The items of the reopened project, by target and path.
-    std::map<std::string, json> Items() {
-        Must([&](std::ostream& out, std::ostream& err) {
-            return RunProjectJson(Options(), p.path, out, err);
-        });
-        std::map<std::string, json> items;
-        const json listing = json::parse(p.out.str());
-        for (const json& target : listing["targets"]) {
-            for (const json& item : target["items"])
-                items[target["name"].get<std::string>() + ":" + item["path"].get<std::string>()] =
-                    item;
+        p.description = p.scratch.Write("board.xml", kBoard);
+        const std::string other =
+            p.scratch.Write("other.xml", "<Target><Line name=\"L\"/></Target>");
+        ASSERT_EQ(p.Run([&](std::ostream& out, std::ostream& err) {
+            return RunProjectNew(Options(), p.path, {"T=" + p.description, "U=" + other}, false,
+                                 out, err);
+        }),
+                  0)
+            << p.err.str();
+        for (const auto& [resource, name] : {std::pair{"C0/DIO0", "DIO0"}, {"C0/DIO0", "Backup"}}) {
+            ASSERT_EQ(p.Run([&](std::ostream& out, std::ostream& err) {
+                return RunAddItem(Options(), p.path, {"T", resource, name}, out, err);
+            }),
+                      0)
+                << p.err.str();
         }
-        return items;
     }
-    // Runs a rename that must be refused and checks that the project file did not change.
-    void Refused(const std::string& item, const std::string& name) {
-        const std::string before = Slurp(p.path);
-        EXPECT_EQ(Item("T", item, "rename", {name}), 1) << name;
-        EXPECT_NE(p.err.str().find("refuses to rename"), std::string::npos) << p.err.str();
-        EXPECT_EQ(Slurp(p.path), before) << name;
+    // Runs ACTION on ITEM of target T with ARGUMENTS and the session's ANSWERS.
+    int Item(const std::string& item, const std::string& action,
+             std::vector<std::string> arguments = {}, std::vector<std::string> answers = {},
+             std::map<std::string, std::string> options = {}) {
+        HostOptions host = Options();
+        host.answers = std::move(answers);
+        host.record = true;
+        ItemRequest request{"T", item, action, std::move(arguments), std::move(options)};
+        return p.Run([&](std::ostream& out, std::ostream& err) {
+            return RunItem(host, p.path, request, out, err);
+        });
     }
-    // Runs a move that must be refused with a message holding WHY; the file stays as it was.
-    void MoveRefused(const std::string& item, std::vector<std::string> arguments,
-                     std::map<std::string, std::string> options, const std::string& why) {
-        const std::string before = Slurp(p.path);
-        EXPECT_EQ(Item("T", item, "move", arguments, options), 1);
-        EXPECT_NE(p.err.str().find(why), std::string::npos) << p.err.str();
-        EXPECT_EQ(Slurp(p.path), before);
+    nlohmann::json ItemNamed(const std::string& name) {
+        std::ostringstream listing;
+        EXPECT_EQ(RunProjectJson(Options(), p.path, listing, p.err), 0);
+        const auto parsed = nlohmann::json::parse(listing.str());
+        for (const auto& target : parsed["targets"]) {
+            for (const auto& item : target["items"]) {
+                if (item["path"] == name)
+                    return item;
+            }
+        }
+        ADD_FAILURE() << "no item " << name << " in " << listing.str();
+        return nlohmann::json::object();
     }
+    std::string Out() const { return p.out.str(); }
+    std::string Err() const { return p.err.str(); }
+
     ScratchProject p;
 };
 
-TEST_F(CliItemCommands, TheModuleJudgesNewNamesInTheItemsScope) {
-    Add("T", "DIO0", "F/Pump");
-    Add("T", "AI0", "Level");
-    Add("U", "DIO0", "Valve");
+TEST_F(CliItemCommands, AConflictIsExplainedAndAResourceChosenWithTheNameFollowing) {
+    ASSERT_EQ(Item("Backup", "menu"), 0) << Err();
+    EXPECT_NE(Out().find("Select Resource...  {A117026A-AD51-4C63-8341-085C842D9F23}"),
+              std::string::npos);
+    EXPECT_NE(Out().find("Explain Error...  {CBB26BAB-B605-4BC7-BE58-98DDC98C9F70}"),
+              std::string::npos);
 
-    // Its own name in another case needs no check at all; blanks around a name go.
-    EXPECT_EQ(Item("T", "F/Pump", "rename", {"PUMP"}), 0) << p.err.str();
-    EXPECT_EQ(Item("T", "F/pump", "rename", {" Pump2\t"}), 0) << p.err.str();
-    // Taken in the same scope (the target, folders included), whatever the case and blanks.
-    Refused("Level", "pump2");
-    Refused("F/Pump2", " LEVEL ");
-    // Characters no name may hold, even when unique, and even when the rest is the item's own
-    // name (the comparison of names passes over control characters).
-    Refused("Level", "Le|vel");
-    Refused("Level", "Le\x01vel");
-    Refused("Level", "Tank\x1f");
-    Refused("Level", "Tank\"1");
-    // Another target is another scope.
-    EXPECT_EQ(Item("U", "Valve", "rename", {"Level"}), 0) << p.err.str();
+    // The explanation names both items, and the user asks to be shown the one in the way.
+    const std::string saved = Slurp(p.path);
+    ASSERT_EQ(Item("Backup", "run", {"explain-error"}, {"explain-error:0=1"}), 0) << Err();
+    EXPECT_NE(Out().find("the project tree selects and shows \"DIO0\""), std::string::npos);
+    const size_t message = Out().find("8 = \"");
+    ASSERT_NE(message, std::string::npos) << Out();
+    const std::string line = Out().substr(message, Out().find('\n', message) - message);
+    EXPECT_NE(line.find("Backup"), std::string::npos) << line;
+    EXPECT_NE(line.find("DIO0"), std::string::npos) << line;
+    EXPECT_NE(Out().find("9 = 0"), std::string::npos);
+    EXPECT_NE(Out().find("0 still open"), std::string::npos);
+    EXPECT_EQ(Slurp(p.path), saved);
 
-    const auto items = Items();
-    EXPECT_EQ(items.count("T:F/Pump2"), 1u);
-    EXPECT_EQ(items.count("T:Level"), 1u);
-    EXPECT_EQ(items.count("U:Level"), 1u);
-    EXPECT_EQ(items.size(), 3u);
+    // "DIO0" was named after its line: it takes the new line's name; the other item is then free.
+    ASSERT_EQ(
+        Item("DIO0", "run", {"select-resource"},
+             {"select-resource:0=0", "select-resource:1=text:/C0/DIO1", "select-resource:2=1"}),
+        0)
+        << Err();
+    EXPECT_NE(Out().find("9 = \"/C0/DIO0\""), std::string::npos) << Out();
+    EXPECT_NE(Out().find("0 still open"), std::string::npos);
+    const auto moved = ItemNamed("DIO1");
+    EXPECT_EQ(moved["resource"], "/C0/DIO1");
+    EXPECT_EQ(moved["status"], 0);
+    EXPECT_EQ(ItemNamed("Backup")["status"], 0);
 }
 
-TEST_F(CliItemCommands, TheErrorTextNamesBothItemsUntilTheOtherLetsGo) {
-    Add("T", "DIO0", "Pump");
-    Add("T", "DIO0", "F/Spare");
-    auto items = Items();
-    for (const char* path : {"T:Pump", "T:F/Spare"}) {
-        // A conflict is told by both items, each naming itself first.
-        const std::string error = items[path]["error"];
-        EXPECT_NE(error.find("\"Pump\""), std::string::npos) << error;
-        EXPECT_NE(error.find("\"Spare\""), std::string::npos) << error;
-        EXPECT_EQ(error.find('<'), std::string::npos) << error;
-    }
-    EXPECT_LT(items["T:F/Spare"]["error"].get<std::string>().find("Spare"),
-              items["T:F/Spare"]["error"].get<std::string>().find("Pump"));
-    EXPECT_EQ(items["T:Pump"]["physical"], false);
-
-    Must([&](std::ostream& out, std::ostream& err) {
-        return RunRemoveItem(Options(), p.path, "T", "Pump", out, err);
-    });
-    items = Items();
-    EXPECT_EQ(items["T:F/Spare"]["statusText"], "bound");
-    EXPECT_EQ(items["T:F/Spare"]["error"], "");
+TEST_F(CliItemCommands, RefusalsLeaveTheProjectAsItWas) {
+    const std::string saved = Slurp(p.path);
+    // A dialog whose answer cannot be read as what it should be fails, and changes nothing.
+    EXPECT_EQ(Item("DIO0", "run", {"select-resource"},
+                   {"select-resource:0=0", "select-resource:1=7", "select-resource:2=1"}),
+              1);
+    EXPECT_NE(Err().find("failed (status 0x80070057)"), std::string::npos) << Err();
+    EXPECT_NE(Out().find("0 still open"), std::string::npos) << Out();
+    EXPECT_EQ(Item("DIO0", "run", {"{00000000-0000-0000-0000-000000000001}"}), 1);
+    EXPECT_NE(Err().find("has no command"), std::string::npos);
+    EXPECT_EQ(Item("DIO0", "run", {"nonsense"}), 1);
+    EXPECT_EQ(Item("DIO0", "drop-check", {"T/Nowhere"}), 1);
+    EXPECT_EQ(Item("DIO0", "properties", {}, {}, {{"--set", "no equals sign"}}), 1);
+    EXPECT_EQ(Slurp(p.path), saved);
 }
 
-TEST_F(CliItemCommands, OnlyAMoveToAnotherTargetBindsTheItemAgain) {
-    Add("T", "DIO0", "Pump");
-    Add("T", "DIO0", "Spare"); // waits for DIO0 behind Pump
-    Add("T", "AI0", "F/Level");
-    Add("U", "AI0", "Level");
+TEST_F(CliItemCommands, PropertiesHelpAndDropCheck) {
+    ASSERT_EQ(Item("DIO0", "properties", {}, {}, {{"--set", "Direction=Output"}}), 0) << Err();
+    EXPECT_NE(Out().find("applied"), std::string::npos);
+    EXPECT_NE(Out().find("Direction"), std::string::npos); // the dialog was shown it
+    EXPECT_NE(ItemNamed("DIO0")["compileConfiguration"].get<std::string>().find("Direction=Output"),
+              std::string::npos);
+    // Closed without an answer: nothing to save.
+    const std::string saved = Slurp(p.path);
+    ASSERT_EQ(Item("DIO0", "properties"), 0) << Err();
+    EXPECT_NE(Out().find("nothing changed"), std::string::npos);
+    EXPECT_EQ(Slurp(p.path), saved);
 
-    // Within the target Pump keeps its reservation: binding again would have handed DIO0 to
-    // Spare, next in line.
-    EXPECT_EQ(Item("T", "Pump", "move", {"f"}), 0) << p.err.str();
-    auto items = Items();
-    EXPECT_EQ(items["T:F/Pump"]["statusText"], "bound");
-    EXPECT_EQ(items["T:Spare"]["statusText"], "conflict");
+    ASSERT_EQ(Item("DIO0", "help"), 0) << Err();
+    EXPECT_NE(Out().find("path: /"), std::string::npos) << Out();
+    EXPECT_NE(Out().find("/help/board.chm\n"), std::string::npos) << Out();
+    EXPECT_NE(Out().find("topic: lines.html\n"), std::string::npos);
 
-    MoveRefused("F/Pump", {"Nowhere"}, {}, "has no folder \"Nowhere\"");
-    MoveRefused("F/Pump", {"Spare"}, {}, "is no folder");
-    MoveRefused("F", {"F"}, {}, "cannot go into itself");
-    MoveRefused("F", {}, {{"--to-target", "U"}}, "already has an I/O item called \"Level\"");
-
-    // To another target: the item lets go of T's DIO0 (Spare gets it) and binds in U's tree.
-    EXPECT_EQ(Item("T", "F/Pump", "move", {"/"}, {{"--to-target", "U"}}), 0) << p.err.str();
-    EXPECT_NE(p.out.str().find("Spare: bound"), std::string::npos) << p.out.str();
-    items = Items();
-    EXPECT_EQ(items["U:Pump"]["statusText"], "bound");
-    EXPECT_EQ(items["U:Pump"]["resource"], "/DIO0");
-    EXPECT_EQ(items["T:Spare"]["statusText"], "bound");
-    EXPECT_EQ(items["T:Spare"]["error"], "");
-
-    // A target without the resource: missing, and the text names the item.
-    EXPECT_EQ(Item("U", "Pump", "move", {}, {{"--to-target", "V"}}), 0) << p.err.str();
-    items = Items();
-    EXPECT_EQ(items["V:Pump"]["statusText"], "missing");
-    const std::string error = items["V:Pump"]["error"];
-    EXPECT_NE(error.find("\"Pump\""), std::string::npos) << error;
-    EXPECT_EQ(error.find('<'), std::string::npos) << error;
-    // A folder takes its items along; its item binds in U, where Level holds AI0 already.
-    EXPECT_EQ(Item("T", "F/Level", "rename", {"Gauge"}), 0) << p.err.str();
-    EXPECT_EQ(Item("T", "F", "move", {}, {{"--to-target", "U"}}), 0) << p.err.str();
-    EXPECT_NE(p.out.str().find("F/Gauge: conflict"), std::string::npos) << p.out.str();
-    // Reopened, the project binds the items in the order they asked for their resources.
-    items = Items();
-    EXPECT_EQ(items["U:F/Gauge"]["statusText"], "conflict");
-    EXPECT_EQ(items["U:Level"]["statusText"], "bound");
-}
-
-TEST_F(CliItemCommands, ActionsAndItemsThatDoNotExistAreRefused) {
-    Add("T", "DIO0", "Pump");
-    const std::string before = Slurp(p.path);
-    EXPECT_EQ(Item("T", "Nope", "rename", {"X"}), 1);
-    EXPECT_NE(p.err.str().find("has no item \"Nope\""), std::string::npos) << p.err.str();
-    EXPECT_EQ(Item("T", "Pump", "rename", {}), 1);
-    EXPECT_NE(p.err.str().find("usage: item PROJECT --target T ITEM rename NEWNAME"),
-              std::string::npos)
-        << p.err.str();
-    EXPECT_EQ(Item("T", "Pump", "frobnicate", {}), 1);
-    EXPECT_NE(p.err.str().find("unknown item action"), std::string::npos) << p.err.str();
-    EXPECT_EQ(Slurp(p.path), before);
+    EXPECT_EQ(Item("DIO0", "drop-check", {"U"}), 0) << Err();
+    EXPECT_NE(Out().find("may be dropped under \"U\""), std::string::npos);
 }
 
 } // namespace
