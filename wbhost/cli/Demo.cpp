@@ -432,6 +432,73 @@ void PlayItemCommands(Transcript& script, const HostOptions& options, const Work
         20);
 }
 
+void PlayItemDialogs(Transcript& script, const HostOptions& options, const WorkFolder& work) {
+    const std::string project = work.File("demo.wbproj");
+    // A dialog in a session without a user answers what the session was told to; the runs are
+    // recorded, with the host references they were handed.
+    const auto item = [&](const std::string& title, const ItemRequest& request,
+                          const std::vector<std::string>& answers, const Expect& expect) {
+        HostOptions answered = options;
+        answered.answers = answers;
+        answered.record = !answers.empty();
+        std::string command;
+        for (const std::string& answer : answers)
+            command += "--answer " + answer + " ";
+        command += std::string(answered.record ? "--record " : "") + "item " + project +
+                   " --target " + request.target + " " + request.item + " " + request.action;
+        for (const std::string& argument : request.arguments)
+            command += " " + argument;
+        script.Step(title, command, expect, [&](std::ostream& out, std::ostream& err) {
+            return RunItem(answered, project, request, out, err);
+        });
+    };
+    item("The menu of \"Standby\", in conflict: it can explain its error",
+         {"K40", "Standby", "menu", {}, {}}, {},
+         {0, {"Explain Error...  {CBB26BAB-B605-4BC7-BE58-98DDC98C9F70}"}, {}});
+    item("The explanation names the item that holds the line; asked to, the tree shows it",
+         {"K40", "Standby", "run", {"explain-error"}, {}}, {"explain-error:0=1"},
+         {0,
+          {"TIOExplainErrorDialog.gx (explain-error)", "as the I/O item \\\"Valve\\\"",
+           "the project tree selects and shows \"Valve\"", "0 still open"},
+          {}});
+    const std::vector<std::string> chooseDio = {"select-resource:0=0", "select-resource:2=1"};
+    auto choose = [&](const char* path) {
+        std::vector<std::string> answers = chooseDio;
+        answers.push_back(std::string("select-resource:1=text:") + path);
+        return answers;
+    };
+    item("Choose another line for \"Standby\": bound now, and the user's own name stays",
+         {"K40", "Standby", "run", {"select-resource"}, {}}, choose("/RearConnector/DIO6"),
+         {0,
+          {"ran select-resource on \"Standby\"", "9 = \"/RearConnector/DIO3\"", "0 still open"},
+          {"is now called"}});
+    script.Step(
+        "An item named after its line, as the board shows it",
+        "project add-item " + project +
+            " --target K40 --resource RearConnector/DIO4 "
+            "--name DIO4",
+        {0, {"Tangent I/O item \"DIO4\""}, {}}, [&](std::ostream& out, std::ostream& err) {
+            return RunAddItem(options, project, {"K40", "RearConnector/DIO4", "DIO4"}, out, err);
+        });
+    item("Choose DIO7 for it: the name follows the line's display name",
+         {"K40", "DIO4", "run", {"select-resource"}, {}}, choose("/RearConnector/DIO7"),
+         {0, {"\"DIO4\" is now called \"DIO7\"", "0 still open"}, {}});
+    script.Step(
+        "Reopened, both items are bound where they were put", "project list " + project + " --json",
+        {0, {"\"path\": \"DIO7\""}, {}},
+        [&](std::ostream& out, std::ostream& err) {
+            std::ostringstream listing;
+            const int exit = RunProjectJson(options, project, listing, err);
+            out << listing.str();
+            const bool bound = HoldsStatuses(listing.str(), {{"Standby", 0}, {"DIO7", 0}}, err);
+            return exit != 0 || !bound ? 1 : 0;
+        },
+        0);
+    item("Help for \"Valve\": its line names none, nor does the board, so the module's own page",
+         {"K40", "Valve", "help", {}, {}}, {},
+         {0, {"/help/wbfpgaconcepts.chm", "topic: Performing_Basic_I_O.html"}, {}});
+}
+
 void PlayPrograms(Transcript& script, const HostOptions& options) {
     script.Step("A unique name next to the names taken",
                 "program TIOGenUniqueName.gx --input 0=text:Valve --input \"1=list:Valve|Valve1\"",
@@ -478,6 +545,7 @@ int RunDemo(const HostOptions& options, const DemoSettings& settings, std::ostre
     PlayProject(script, options, settings.examples, work);
     PlayEdits(script, options, work);
     PlayItemCommands(script, options, work);
+    PlayItemDialogs(script, options, work);
     PlayBulkImport(script, options, work);
     PlayPrograms(script, options);
     if (script.Failures() != 0) {
