@@ -328,6 +328,13 @@ TEST_F(ItemCommandsTest, APhysicalItemIsDroppedOnlyWithinItsTargetAndTheDropProg
     EXPECT_EQ(dragDrop->Drop(0, 0, 0, 1, 0x4, &effect), E_FAIL);
     EXPECT_EQ(dragDrop->Drop(0, 0, 0, 0, 0, &effect), S_FALSE);
     EXPECT_EQ(effect, 4u);
+
+    // Dropped out of its folder: it binds where it now is, holding its line still (a second
+    // reservation of its own would put it in conflict with itself).
+    ASSERT_EQ(Project().MoveItem(*item, *target.Get()), S_OK);
+    EXPECT_EQ(As<IwbProjectDragDropped>(item)->Dropped(), S_OK);
+    EXPECT_EQ(Status(item), 0);
+    EXPECT_EQ(OpenReferences(), 0u);
 }
 
 TEST_F(ItemCommandsTest, FailingRunnerStepsComeBackAsStatusesWithTheItemUnchanged) {
