@@ -27,20 +27,25 @@ constexpr std::u16string_view kDeferredLoadPath = u":DeferredLoadPath";
 // must still end.
 constexpr int kMaxDeferredRounds = 16;
 
+// What the rules make of a name (CompareWalk::ClassOf).
+constexpr uint8_t kIgnoredName = 1; // takes no part in the pairing
+constexpr uint8_t kLatencyName = 2; // "MemoryLatency": compared as a number
+constexpr uint8_t kListName = 4;    // "SupportedValues": compared as a list
+
 // Localized names travel in whatever language the target was described in; a description in
 // another language must compare equal, so they are left out on both sides, as are localized
 // texts and "Value".
-bool IsIgnoredName(std::u16string_view name) {
-    return EqualsNoCase(name, kValue) || EqualsNoCase(name, u"LocalizedName") ||
-           EqualsNoCase(name, u"LocalizedValues");
+uint8_t ClassifyName(std::u16string_view name) {
+    if (EqualsNoCase(name, kValue) || EqualsNoCase(name, u"LocalizedName") ||
+        EqualsNoCase(name, u"LocalizedValues"))
+        return kIgnoredName;
+    if (EqualsNoCase(name, kMemoryLatency))
+        return kLatencyName;
+    return EqualsNoCase(name, kSupportedValues) ? kListName : 0;
 }
 
 bool IsLocalized(const ResTreeEntry& entry) {
     return entry.Kind() == EntryKind::LocalizedText;
-}
-
-bool IsIgnored(const ResTreeEntry& entry) {
-    return IsLocalized(entry) || IsIgnoredName(entry.Name());
 }
 
 // The collator's order of two names; the same spelling needs no collator.
@@ -75,20 +80,12 @@ ResTreeNode* ChildOf(const ResTreeEntry& entry) {
 
 // Loads a node's deferred content, and what that content defers in turn.
 void LoadAllDeferred(ResTreeNode& node) {
-    for (int round = 0; round < kMaxDeferredRounds; ++round) {
+    for (int round = 0; round < kMaxDeferredRounds && node.MayHoldDeferredContent(); ++round) {
         const auto found = node.Find(kDeferredLoadPath);
         if (found == node.End() || !IsTextKind(found->Kind()))
             return;
         node.LoadDeferred();
     }
-}
-
-// The entries of b that a must match.
-size_t CountComparedEntries(const ResTreeNode& b) {
-    size_t count = 0;
-    for (auto it = b.Begin(); it != b.End(); ++it)
-        count += IsIgnored(*it) ? 0 : 1;
-    return count;
 }
 
 // Answers whether a piece equals (case aside) one of the offered pieces. A short list is
@@ -149,9 +146,9 @@ struct CompareWalk::Tally {
 // the two nodes disagree on: the k-th of a name in a takes the k-th of that name in b.
 class CompareWalk::Counterparts {
 public:
-    explicit Counterparts(const ResTreeNode& b) {
+    Counterparts(const ResTreeNode& b, CompareWalk& walk) {
         for (auto it = b.Begin(); it != b.End(); ++it) {
-            if (IsIgnoredName(it->Name()))
+            if ((walk.ClassOf(it->Name()) & kIgnoredName) != 0)
                 continue;
             Slot& slot = slots_[std::u16string_view(it->Name())];
             if (IsLocalized(*it))
@@ -198,6 +195,16 @@ private:
     std::map<std::u16string_view, Slot, qv::kern::LessNoCase> slots_;
 };
 
+uint8_t CompareWalk::ClassOf(std::u16string_view name) {
+    if (const uint8_t* known = classes_.Find(name))
+        return *known;
+    return classes_.Add(name, ClassifyName(name));
+}
+
+bool CompareWalk::Ignored(const ResTreeEntry& entry) {
+    return IsLocalized(entry) || (ClassOf(entry.Name()) & kIgnoredName) != 0;
+}
+
 uint32_t CompareWalk::Nodes(ResTreeNode* a, ResTreeNode* b) {
     if (a == nullptr)
         return b != nullptr ? kNotSatisfied : kMatch;
@@ -220,7 +227,10 @@ uint32_t CompareWalk::SortedEntries(ResTreeNode& a, ResTreeNode& b, Tally& tally
     auto f = b.Begin();
     const auto bEnd = b.End();
     for (auto e = a.Begin(); e != a.End(); ++e) {
-        if (IsIgnored(*e))
+        if (IsLocalized(*e))
+            continue;
+        const uint8_t nameClass = ClassOf(e->Name());
+        if ((nameClass & kIgnoredName) != 0)
             continue;
         int order = -1;
         while (f != bEnd && (order = CompareNames(f->Name(), e->Name())) < 0)
@@ -231,7 +241,7 @@ uint32_t CompareWalk::SortedEntries(ResTreeNode& a, ResTreeNode& b, Tally& tally
         // A required entry that the offered side holds as a localized text is taken as given.
         if (IsLocalized(counterpart))
             continue;
-        if (Pair(a, *e, counterpart, tally) == kNotSatisfied)
+        if (Pair(a, *e, counterpart, nameClass, tally) == kNotSatisfied)
             return kNotSatisfied;
     }
     for (; f != bEnd; ++f)
@@ -243,34 +253,42 @@ uint32_t CompareWalk::SortedEntries(ResTreeNode& a, ResTreeNode& b, Tally& tally
 // the same places, the k-th entry of each name sits at the same place on both sides, so they
 // pair place by place; from the first disagreement on, a name index of b pairs the rest.
 uint32_t CompareWalk::SequencedEntries(ResTreeNode& a, ResTreeNode& b, Tally& tally) {
-    tally.unmatched = CountComparedEntries(b);
     auto e = a.Begin();
     auto f = b.Begin();
     for (; e != a.End() && f != b.End() && SameSlot(*e, *f); ++e, ++f) {
-        if (IsIgnored(*e))
+        if (IsLocalized(*e))
             continue;
-        if (Pair(a, *e, *f, tally) == kNotSatisfied)
+        const uint8_t nameClass = ClassOf(e->Name());
+        if ((nameClass & kIgnoredName) != 0)
+            continue;
+        if (Pair(a, *e, *f, nameClass, tally) == kNotSatisfied)
             return kNotSatisfied;
-        --tally.unmatched;
     }
-    if (e != a.End())
-        return RestThroughIndex(a, e, b, tally);
-    if (why_ != nullptr) {
-        for (; f != b.End(); ++f)
+    // Entries paired by place take the same part on both sides (SameSlot), so b's compared
+    // entries left unmatched are those from F on, until the name index pairs some of them.
+    const bool aDone = e == a.End();
+    for (; f != b.End(); ++f) {
+        if (Ignored(*f))
+            continue;
+        ++tally.unmatched;
+        if (aDone)
             NoteExtra(b, *f);
     }
-    return kMatch;
+    return aDone ? kMatch : RestThroughIndex(a, e, b, tally);
 }
 
 uint32_t CompareWalk::RestThroughIndex(ResTreeNode& a, ResTreeNode::Position e, ResTreeNode& b,
                                        Tally& tally) {
-    Counterparts counterparts(b);
+    Counterparts counterparts(b, *this);
     for (auto paired = a.Begin(); paired != e; ++paired) {
-        if (!IsIgnored(*paired))
+        if (!Ignored(*paired))
             counterparts.Skip(paired->Name());
     }
     for (; e != a.End(); ++e) {
-        if (IsIgnored(*e))
+        if (IsLocalized(*e))
+            continue;
+        const uint8_t nameClass = ClassOf(e->Name());
+        if ((nameClass & kIgnoredName) != 0)
             continue;
         bool localized = false;
         const ResTreeEntry* f = counterparts.Next(e->Name(), localized);
@@ -278,7 +296,7 @@ uint32_t CompareWalk::RestThroughIndex(ResTreeNode& a, ResTreeNode::Position e, 
             continue; // held by the offered side as a localized text: taken as given
         if (f == nullptr)
             return Short(CompareReason::Missing, a, *e, nullptr);
-        if (Pair(a, *e, *f, tally) == kNotSatisfied)
+        if (Pair(a, *e, *f, nameClass, tally) == kNotSatisfied)
             return kNotSatisfied;
         --tally.unmatched;
     }
@@ -288,12 +306,12 @@ uint32_t CompareWalk::RestThroughIndex(ResTreeNode& a, ResTreeNode::Position e, 
 }
 
 uint32_t CompareWalk::Pair(const ResTreeNode& a, const ResTreeEntry& e, const ResTreeEntry& f,
-                           Tally& tally) {
+                           uint8_t nameClass, Tally& tally) {
     const WString* ta = TextOf(e);
     const WString* tb = TextOf(f);
     if ((ta == nullptr) != (tb == nullptr))
         return Short(CompareReason::KindDiffers, a, e, &f);
-    if (ta != nullptr && Texts(a, e, f, tally) == kNotSatisfied)
+    if (ta != nullptr && Texts(a, e, f, nameClass, tally) == kNotSatisfied)
         return kNotSatisfied;
     ResTreeNode* const ca = ChildOf(e);
     ResTreeNode* const cb = ChildOf(f);
@@ -310,10 +328,10 @@ uint32_t CompareWalk::Pair(const ResTreeNode& a, const ResTreeEntry& e, const Re
 }
 
 uint32_t CompareWalk::Texts(const ResTreeNode& a, const ResTreeEntry& e, const ResTreeEntry& f,
-                            Tally& tally) {
+                            uint8_t nameClass, Tally& tally) {
     const std::u16string_view ta = *e.Text();
     const std::u16string_view tb = *f.Text();
-    if (EqualsNoCase(e.Name(), kMemoryLatency)) {
+    if ((nameClass & kLatencyName) != 0) {
         const uint64_t required = LeadingNumber(ta);
         const uint64_t offered = LeadingNumber(tb);
         if (offered > required)
@@ -324,7 +342,7 @@ uint32_t CompareWalk::Texts(const ResTreeNode& a, const ResTreeEntry& e, const R
         }
         return kMatch;
     }
-    if (!EqualsNoCase(e.Name(), kSupportedValues)) {
+    if ((nameClass & kListName) == 0) {
         // Identical texts split alike and cover each other piece for piece.
         if (ta == tb)
             return kMatch;
@@ -371,14 +389,14 @@ void CompareWalk::Tolerate(CompareReason reason, const ResTreeNode& node, const 
 }
 
 void CompareWalk::PassOver(const ResTreeNode& b, const ResTreeEntry& f, Tally& tally) {
-    if (IsIgnored(f))
+    if (Ignored(f))
         return;
     ++tally.unmatched;
     NoteExtra(b, f);
 }
 
 void CompareWalk::NoteExtra(const ResTreeNode& b, const ResTreeEntry& f) {
-    if (why_ == nullptr || IsIgnored(f))
+    if (why_ == nullptr || Ignored(f))
         return;
     why_->findings.push_back(CompareFinding{CompareReason::OfferedExtra, EntryPath(b, f),
                                             std::u16string(), TextOrEmpty(&f), std::u16string()});

@@ -3,6 +3,7 @@
 
 #include "resource_tree/CompareExplanation.h"
 #include "resource_tree/ResTreeNode.h"
+#include "resource_tree/SpellingTable.h"
 
 #include <cstdint>
 
@@ -31,9 +32,10 @@ private:
     uint32_t SequencedEntries(ResTreeNode& a, ResTreeNode& b, Tally& tally);
     uint32_t RestThroughIndex(ResTreeNode& a, ResTreeNode::Position e, ResTreeNode& b,
                               Tally& tally);
-    uint32_t Pair(const ResTreeNode& a, const ResTreeEntry& e, const ResTreeEntry& f, Tally& tally);
+    uint32_t Pair(const ResTreeNode& a, const ResTreeEntry& e, const ResTreeEntry& f,
+                  uint8_t nameClass, Tally& tally);
     uint32_t Texts(const ResTreeNode& a, const ResTreeEntry& e, const ResTreeEntry& f,
-                   Tally& tally);
+                   uint8_t nameClass, Tally& tally);
     uint32_t Lists(const ResTreeNode& a, const ResTreeEntry& e, const ResTreeEntry& f,
                    Tally& tally);
 
@@ -49,7 +51,16 @@ private:
     // part.
     void PassOver(const ResTreeNode& b, const ResTreeEntry& f, Tally& tally);
 
+    // What the rules make of an entry's name (the k... flags of CompareWalk.cpp). A description
+    // repeats a few dozen spellings thousands of times, and names compare in the user's locale,
+    // so each spelling is classified once per walk. Entries paired with each other have equal
+    // names, so one class serves both.
+    uint8_t ClassOf(std::u16string_view name);
+    // True when ENTRY takes no part in the pairing (a localized text, or an ignored name).
+    bool Ignored(const ResTreeEntry& entry);
+
     CompareExplanation* why_;
+    SpellingTable<uint8_t> classes_;
 };
 
 } // namespace wbhw

@@ -183,6 +183,8 @@ int32_t ResTreeNode::ParseFile(const std::string& path, bool asChild, ResTreeNod
 }
 
 int32_t ResTreeNode::LoadDeferred() {
+    if (!MayHoldDeferredContent())
+        return kOk;
     const Position found = Find(u":DeferredLoadPath");
     if (found == End() || !IsTextKind(found->Kind()))
         return kOk;

@@ -17,6 +17,21 @@ thread_local int linkHops = 0;
 // Ordered nodes up to this size are scanned; larger ones keep a name index.
 constexpr size_t kIndexFrom = 24;
 
+constexpr std::u16string_view kDeferredLoadPath = u":DeferredLoadPath";
+
+// True when NAME might compare equal to ":DeferredLoadPath". A name that starts with an ASCII
+// letter or digit starts with that character's weight, never the colon's, unless the locale
+// ignores the colon altogether; anything else (punctuation, an ignorable control, a character
+// outside ASCII) is left to the lookup.
+bool MayNameDeferredContent(std::u16string_view name) noexcept {
+    static const bool colonCounts =
+        !qv::kern::EqualsNoCase(kDeferredLoadPath.substr(1), kDeferredLoadPath);
+    if (name.empty() || !colonCounts)
+        return true;
+    const char16_t c = name.front();
+    return !((c >= u'0' && c <= u'9') || (c >= u'A' && c <= u'Z') || (c >= u'a' && c <= u'z'));
+}
+
 } // namespace
 
 ResTreeEntry::ResTreeEntry(WString name, EntryKind kind) : name_(std::move(name)), kind_(kind) {}
@@ -99,7 +114,7 @@ ResTreeNode::Position ResTreeNode::FindLoading(std::u16string_view name) {
     Position found = Find(name);
     if (found != End())
         return found;
-    if (Find(u":DeferredLoadPath") == End())
+    if (!mayDefer_ || Find(kDeferredLoadPath) == End())
         return found;
     LoadDeferred();
     return Find(name);
@@ -130,6 +145,7 @@ const WString* ResTreeNode::TextAt(std::u16string_view name) {
 
 ResTreeNode::Position ResTreeNode::InsertEntry(Position position, WString&& name, EntryKind kind,
                                                bool& inserted) {
+    mayDefer_ = mayDefer_ || MayNameDeferredContent(name);
     if (ordered_) {
         inserted = true;
         const auto before = position.ordered_ ? position.list_ : list_.end();

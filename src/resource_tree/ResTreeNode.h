@@ -229,6 +229,9 @@ public:
                       const LoaderSettings* settings = nullptr);
     // Loads the files named by the ":DeferredLoadPath" entry (once: the entry is removed).
     int32_t LoadDeferred();
+    // False when no entry of this node can be named ":DeferredLoadPath" (told cheaply from each
+    // name as it is inserted), so that the lookup can be spared; true says only "look it up".
+    bool MayHoldDeferredContent() const noexcept { return mayDefer_; }
 
     // Replaces the entry container by one of the other kind, keeping the entries (an unordered
     // node keeps the first of several same-named entries).
@@ -285,6 +288,7 @@ private:
     WString name_;
     WString type_;
     bool ordered_;
+    bool mayDefer_ = false;
     bool notifying_ = false;
     uint32_t pendingChanges_ = 0;
     int32_t deferDepth_ = 0;
