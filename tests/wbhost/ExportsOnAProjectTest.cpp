@@ -4,6 +4,7 @@
 #include "ProjectTestSupport.h"
 #include "cli/HostText.h"
 #include "cli/HostedModule.h"
+#include "framework/IqxProvider.h"
 #include "items/TIOItemInterfaces.h"
 #include "provider/TIOIdentifiers.h"
 #include "runtime/FailureInjection.h"
@@ -283,6 +284,16 @@ TEST_F(ExportsOnAProject, AnItemsResourceShowsWithItsDisplayNameAndStatus) {
         EXPECT_EQ(HostStringBytes(shown.get()), c.shown) << c.resource;
         EXPECT_EQ(status, c.status) << c.resource;
     }
+}
+
+TEST_F(ExportsOnAProject, TheProviderExportHandsOutTheProviderTheSessionWorksWith) {
+    using GetProviderFn = HRESULT(int32_t, void**);
+    auto* getProvider = Export<GetProviderFn>("qxGetProvider");
+    void* current = nullptr;
+    ASSERT_EQ(getProvider(0, &current), S_OK);
+    const auto held = ComPtr<IqxProvider>::Adopt(static_cast<IqxProvider*>(current));
+    EXPECT_EQ(held.Get(), session.Provider());
+    EXPECT_EQ(getProvider(0, nullptr), E_POINTER);
 }
 
 TEST_F(ExportsOnAProject, AHostErrorWhileWritingComesBackMappedWithTheOutputUnchanged) {
