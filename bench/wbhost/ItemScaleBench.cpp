@@ -378,7 +378,7 @@ void BM_ValidateNewName(benchmark::State& state) {
 // Few iterations, each long; the medians of the pairs are what the summary compares.
 BENCHMARK(BM_OpenAndBind)->Unit(benchmark::kMillisecond)->Iterations(6);
 BENCHMARK(BM_RenameConnector)->Arg(0)->Arg(1)->Unit(benchmark::kMillisecond)->Iterations(10);
-BENCHMARK(BM_CreateMultiple)->Unit(benchmark::kMillisecond)->Iterations(6);
+BENCHMARK(BM_CreateMultiple)->Unit(benchmark::kMillisecond)->Iterations(4);
 BENCHMARK(BM_ValidateNewName)->Unit(benchmark::kMillisecond)->Iterations(10);
 
 } // namespace

@@ -61,6 +61,15 @@ TEST_F(ProjectItemTest, TreeOperations) {
     EXPECT_EQ(inner->SetName(u""), E_INVALIDARG);
     EXPECT_EQ(inner->SetName(u"Renamed"), S_OK);
     EXPECT_EQ(NameOf(inner.Get()), u"Renamed");
+    // A renamed child is found by its new name only; a removed one no more.
+    EXPECT_EQ(folder->FindChild(u"renamed", &found), S_OK);
+    EXPECT_EQ(found, inner.Get());
+    found->Release();
+    EXPECT_EQ(folder->FindChild(u"Inner", &found), S_FALSE);
+    using wbhost::project::ProjectItem;
+    EXPECT_TRUE(static_cast<ProjectItem*>(folder.Get())
+                    ->RemoveChild(static_cast<ProjectItem*>(inner.Get())));
+    EXPECT_EQ(folder->FindChild(u"Renamed", &found), S_FALSE);
     // Duplicate names are the plug-in's business: the host accepts them.
     EXPECT_TRUE(Child(root, u"folder"));
 }

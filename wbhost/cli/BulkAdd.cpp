@@ -34,12 +34,12 @@ std::string ListClash(const std::vector<std::u16string>& parts, ListedPlaces& pl
         prefix.push_back(parts[i]);
         const std::u16string folder = wbhw::JoinListText(prefix, u'/');
         if (placed.items.count(folder) != 0)
-            return "\"" + ToUtf8(folder) + "\" is an item of an earlier line, not a folder";
+            return Quoted(folder) + " is an item of an earlier line, not a folder";
         placed.folders.insert(folder);
     }
     const std::u16string item = wbhw::JoinListText(parts, u'/');
     if (placed.folders.count(item) != 0)
-        return "\"" + ToUtf8(item) + "\" is a folder of an earlier line";
+        return Quoted(item) + " is a folder of an earlier line";
     placed.items.insert(item);
     return {};
 }
@@ -57,13 +57,13 @@ LineText CheckLine(project::Project& project, ProjectItem& target, const ItemLin
     const std::u16string resource = ResourceNodePath(project, target, FromUtf8(line.resource));
     if (resource.empty())
         return {{},
-                "target \"" + ToUtf8(target.Name()) + "\" has no resource \"" + line.resource +
-                    "\"",
+                "target " + Quoted(target.Name()) + " has no resource " +
+                    Quoted(FromUtf8(line.resource)),
                 resourceColumn};
     const std::u16string place = FromUtf8(line.name);
     const std::vector<std::u16string> parts = PlaceParts(place);
     if (parts.empty())
-        return {{}, "\"" + line.name + "\" is no item name (empty name or folder)"};
+        return {{}, Quoted(place) + " is no item name (empty name or folder)"};
     std::string why = PlaceConflict(target, parts, ioNames);
     if (why.empty())
         why = ListClash(parts, placed);

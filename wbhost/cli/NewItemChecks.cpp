@@ -34,6 +34,13 @@ void CollectIONames(const ProjectItem& scope, NameSet& names) {
 
 } // namespace
 
+std::string Quoted(std::u16string_view text) {
+    std::string quoted(1, '"');
+    quoted += ToUtf8(text);
+    quoted += '"';
+    return quoted;
+}
+
 std::vector<std::u16string> PlaceParts(std::u16string_view name) {
     std::vector<std::u16string> parts = wbhw::SplitListText(name, u'/', false);
     const bool emptyPart =
@@ -53,17 +60,16 @@ std::string PlaceConflict(const ProjectItem& target, const std::vector<std::u16s
     for (size_t i = 0; i + 1 < parts.size() && folder != nullptr; ++i) {
         const ProjectItem* existing = ChildNamed(*folder, parts[i]);
         if (existing != nullptr && !IsEqualGUID(existing->Type(), wbproj::kFolderType))
-            return "\"" + ToUtf8(parts[i]) + "\" below \"" + ToUtf8(folder->Name()) + "\" is a " +
+            return Quoted(parts[i]) + " below " + Quoted(folder->Name()) + " is a " +
                    ItemTypeName(existing->Type()) + ", not a folder";
         folder = existing;
     }
     // A folder that is still to be made holds nothing yet.
     if (const ProjectItem* existing = folder ? ChildNamed(*folder, parts.back()) : nullptr)
-        return "\"" + ToUtf8(folder->Name()) + "\" already has an item called \"" +
-               ToUtf8(existing->Name()) + "\"";
+        return Quoted(folder->Name()) + " already has an item called " + Quoted(existing->Name());
     if (const auto named = ioNames.find(parts.back()); named != ioNames.end())
-        return "target \"" + ToUtf8(target.Name()) + "\" already has an I/O item called \"" +
-               ToUtf8(*named) + "\"";
+        return "target " + Quoted(target.Name()) + " already has an I/O item called " +
+               Quoted(*named);
     return {};
 }
 

@@ -13,6 +13,9 @@ namespace wbhost::cli {
 
 using NameSet = std::set<std::u16string, qv::kern::LessNoCase>;
 
+// TEXT in double quotes, as UTF-8, for messages.
+std::string Quoted(std::u16string_view text);
+
 // The folder names and the item name of the place NAME ("Folder/Sub/Name"; a "/" after an odd
 // number of backslashes belongs to the name, as the module reads it); empty when NAME or one of
 // its parts is empty.

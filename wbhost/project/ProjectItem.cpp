@@ -41,6 +41,17 @@ HRESULT ProjectItem::SetName(const char16_t* name) {
     if (*name == u'\0')
         return E_INVALIDARG;
     return qv::com::GuardCall([&] {
+        if (parent_ == nullptr) {
+            name_ = name;
+            return S_OK;
+        }
+        // The new name is indexed before the old one goes, so a failure leaves both as they were.
+        auto& index = parent_->childrenByName_;
+        auto [first, last] = index.equal_range(name_);
+        const auto old = std::find_if(first, last, [&](const auto& e) { return e.second == this; });
+        index.emplace(name, this);
+        if (old != last)
+            index.erase(old);
         name_ = name;
         return S_OK;
     });
@@ -67,14 +78,12 @@ HRESULT ProjectItem::FindChild(const char16_t* name, IwbProjectItem** child) {
     if (name == nullptr || child == nullptr)
         return E_POINTER;
     *child = nullptr;
-    for (const auto& each : children_) {
-        if (qv::kern::EqualsNoCase(each->name_, name)) {
-            *child = each.Get();
-            each->AddRef();
-            return S_OK;
-        }
-    }
-    return S_FALSE;
+    const auto found = childrenByName_.find(std::u16string_view(name));
+    if (found == childrenByName_.end())
+        return S_FALSE;
+    *child = found->second;
+    (*child)->AddRef();
+    return S_OK;
 }
 
 HRESULT ProjectItem::CreateChild(const GUID& type, const char16_t* name, IwbProjectItem** child) {
@@ -198,6 +207,7 @@ ComPtr<ProjectItem> ProjectItem::AddChild(const GUID& type, const GUID& id, std:
     if (item) {
         item->parent_ = this;
         children_.push_back(item);
+        IndexChild(item.Get());
     }
     return item;
 }
@@ -216,6 +226,7 @@ ComPtr<ProjectItem> ProjectItem::ReleaseChild(ProjectItem* child) {
     if (it == children_.end())
         return {};
     ComPtr<ProjectItem> held = std::move(*it);
+    UnindexChild(child);
     children_.erase(it);
     held->parent_ = nullptr;
     return held;
@@ -225,7 +236,25 @@ void ProjectItem::AdoptChild(ComPtr<ProjectItem> child) {
     if (!child)
         return;
     child->parent_ = this;
+    ProjectItem* const adopted = child.Get();
     children_.push_back(std::move(child));
+    IndexChild(adopted);
+}
+
+void ProjectItem::IndexChild(ProjectItem* child) {
+    try {
+        childrenByName_.emplace(child->name_, child);
+    } catch (...) {
+        children_.pop_back(); // the child was just appended: it is not kept unfindable
+        throw;
+    }
+}
+
+void ProjectItem::UnindexChild(ProjectItem* child) noexcept {
+    auto [first, last] = childrenByName_.equal_range(child->name_);
+    const auto it = std::find_if(first, last, [&](const auto& e) { return e.second == child; });
+    if (it != last)
+        childrenByName_.erase(it);
 }
 
 void ProjectItem::Close() {
@@ -239,6 +268,7 @@ void ProjectItem::Close() {
     object.Reset();
     std::vector<ComPtr<ProjectItem>> children = std::move(children_);
     children_.clear();
+    childrenByName_.clear();
     for (const auto& child : children)
         child->Close();
 }
