@@ -20,8 +20,7 @@ class BaseItemUI : public CqxProjectItemUI,
 public:
     using Interfaces =
         CqxProjectItemUI::Interfaces::Append<IwbProjectDragDrop, IwbProjectDragDropped,
-                                             IwbProjectItemObserver,
-                                             IwbProjectCutCopyPaste3>;
+                                             IwbProjectItemObserver, IwbProjectCutCopyPaste3>;
 
     // Refuses without a dragged object or one that is not the framework's drag data; otherwise
     // the base's compatibility check decides.

@@ -10,9 +10,9 @@
 #include "host/contracts/IwbProjectItem.h"
 #include "host/contracts/IwbhwTargetResources.h"
 #include "host/runner/ProgramRunner.h"
-#include "kern/CodePage.h"
 #include "items/TIOProgramCall.h"
 #include "items/TIOStrings.h"
+#include "kern/CodePage.h"
 #include "provider/TIONameList.h"
 #include "resource_tree/ResourceCompare.h"
 

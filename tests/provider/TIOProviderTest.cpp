@@ -9,9 +9,9 @@
 #include "framework/IqxCreateNewWizard.h"
 #include "framework/IqxProjectItemValidator.h"
 #include "items/TIOInstanceItemUI.h"
+#include "items/TIOStrings.h"
 #include "provider/ProviderEntry.h"
 #include "provider/TIOIdentifiers.h"
-#include "items/TIOStrings.h"
 
 #include <gtest/gtest.h>
 #include <thread>
