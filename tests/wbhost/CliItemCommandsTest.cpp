@@ -38,9 +38,9 @@ protected:
         }),
                   0)
             << p.err.str();
-        for (const auto& [resource, name] : {std::pair{"C0/DIO0", "DIO0"}, {"C0/DIO0", "Backup"}}) {
+        for (const std::string name : {"DIO0", "Backup"}) {
             ASSERT_EQ(p.Run([&](std::ostream& out, std::ostream& err) {
-                return RunAddItem(Options(), p.path, {"T", resource, name}, out, err);
+                return RunAddItem(Options(), p.path, {"T", "C0/DIO0", name}, out, err);
             }),
                       0)
                 << p.err.str();
