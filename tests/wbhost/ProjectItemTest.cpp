@@ -57,7 +57,6 @@ TEST_F(ProjectItemTest, TreeOperations) {
     EXPECT_EQ(parent, nullptr);
 
     EXPECT_EQ(root.CreateChild(wbproj::kFolderType, u"", nullptr), E_INVALIDARG);
-    EXPECT_EQ(root.CreateChild(wbproj::kFolderType, nullptr, nullptr), E_POINTER);
     EXPECT_EQ(inner->SetName(u""), E_INVALIDARG);
     EXPECT_EQ(inner->SetName(u"Renamed"), S_OK);
     EXPECT_EQ(NameOf(inner.Get()), u"Renamed");
@@ -124,7 +123,6 @@ TEST_F(ProjectItemTest, PropertiesAreTypedAndAbsentAnswersFalse) {
     EXPECT_EQ(bag->GetInt(u"missing", &number), S_FALSE);
     EXPECT_EQ(number, 0);
     EXPECT_EQ(bag->GetBool(u"", &number), E_INVALIDARG);
-    EXPECT_EQ(bag->SetString(nullptr, u"x", 0), E_POINTER);
 
     EXPECT_EQ(bag->SetString(u"empty", nullptr, 0), S_OK);
     EXPECT_EQ(bag->GetString(u"empty", &text), S_OK); // present, though empty
@@ -224,7 +222,6 @@ TEST_F(ProjectItemTest, TargetsOfferTheirTreeAndHearItemChanges) {
     EXPECT_EQ(project->TargetOf(*target.Get())->Suspended(), true);
     change->RestoreChangeHandling(0);
     change->ItemChanged(item.Get());
-    EXPECT_EQ(change->ItemChanged(nullptr), E_POINTER);
     const auto* host = project->TargetOf(*target.Get());
     EXPECT_EQ(host->Changed().size(), 2u);
     EXPECT_EQ(host->SuspendedChanges(), 1);

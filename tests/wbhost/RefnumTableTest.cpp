@@ -39,15 +39,11 @@ TEST(RefnumTable, RefnumsLeadToTheirObjectsUntilRemoved) {
     observer->Release();
 }
 
-TEST(RefnumTable, BadArgumentsAreFailuresNeverCrashes) {
+TEST(RefnumTable, UnknownRefnumsAndUnalignedIdentifiersAreFailuresNeverCrashes) {
     const WBRefNum unknown = 0xDEADBEEFu;
     void* object = &object;
     EXPECT_EQ(QueryInterfaceForWBRefNum(&unknown, &IUnknown::iid, &object), E_INVALIDARG);
     EXPECT_EQ(object, nullptr);
-    EXPECT_EQ(QueryInterfaceForWBRefNum(nullptr, &IUnknown::iid, &object), E_POINTER);
-    EXPECT_EQ(QueryInterfaceForWBRefNum(&unknown, nullptr, &object), E_POINTER);
-    EXPECT_EQ(QueryInterfaceForWBRefNum(&unknown, &IUnknown::iid, nullptr), E_POINTER);
-    EXPECT_EQ(RefnumTable::Instance().Add(nullptr), 0u);
     // An identifier need not be aligned as a GUID is.
     alignas(8) unsigned char bytes[17] = {};
     std::memcpy(bytes + 1, &IUnknown::iid, sizeof(IID));

@@ -1,5 +1,7 @@
-// The host resource tree: which nodes hear which change bits when the tree is edited.
+// The host resource tree: which nodes hear which change bits when the tree is edited, and finding
+// nodes by path through the node interface.
 #include "TestObjects.h"
+#include "com/TaskMem.h"
 #include "host/contracts/IwbhwResourceTreeAccess.h"
 #include "resources/ResourceService.h"
 
@@ -19,6 +21,8 @@ const char16_t* const kBoard = uR"(<Target name="Board">
     <DigitalLine name="DIO0"><Line>0</Line><Pins><Pin name="P1"/></Pins></DigitalLine>
     <DigitalLine name="DIO1"><Line>1</Line></DigitalLine>
   </Connector>
+  <DigitalLine name="A/B"><Line>slash</Line></DigitalLine>
+  <:Link name="Clock">C0/DIO0</:Link>
 </Target>)";
 
 class ResourceTreeTest : public ::testing::Test {
@@ -38,6 +42,25 @@ protected:
         ComPtr<IwbhwResourceTreeNode> object;
         EXPECT_EQ(tree_->NodeObject(&At(path), object.Put()), S_OK);
         return object;
+    }
+    // FindNode from the root: the status, the matched length and the found node's path.
+    struct Answer {
+        HRESULT status;
+        uint32_t matched;
+        std::u16string path;
+        bool operator==(const Answer&) const = default;
+    };
+    Answer Find(const char16_t* path) {
+        Answer answer{E_FAIL, 12345, u""};
+        ComPtr<IwbhwResourceTreeNode> node;
+        answer.status = Object(u"")->FindNode(path, &answer.matched, node.Put());
+        if (node) {
+            BSTR text = nullptr;
+            node->GetPath(&text);
+            answer.path = qv::com::BstrToString(text);
+            SysFreeString(text);
+        }
+        return answer;
     }
     // Registers OBSERVER on the node at each path with the mask and kind given.
     void Watch(test::RecordingObserver* observer, std::initializer_list<std::u16string_view> paths,
@@ -210,6 +233,61 @@ TEST_F(ResourceTreeTest, AnObserverMayEditTheTreeWhileBeingTold) {
     };
     ASSERT_EQ(Object(u"C0").As<IwbhwResourceTreeAccess>()->RemoveSubTree(u"DIO0"), S_OK);
     EXPECT_TRUE(At(u"C0").IsEmpty());
+}
+
+TEST_F(ResourceTreeTest, FoundPathsMatchWholeAndMissesCountTheNamesThatLed) {
+    EXPECT_EQ(Find(u"C0/DIO0"), (Answer{S_OK, 7, u"/C0/DIO0"}));
+    EXPECT_EQ(Find(u"c0/dio0"), (Answer{S_OK, 7, u"/C0/DIO0"}));
+    EXPECT_EQ(Find(u""), (Answer{S_OK, 0, u"/"}));
+    EXPECT_EQ(Find(u"C0/DIO9"), (Answer{S_FALSE, 2, u""}));
+    EXPECT_EQ(Find(u"C0/DIO0/Pins/P9"), (Answer{S_FALSE, 12, u""}));
+    EXPECT_EQ(Find(u"Nowhere/DIO0"), (Answer{S_FALSE, 0, u""}));
+    // A text entry is not a node.
+    EXPECT_EQ(Find(u"C0/DIO0/Line"), (Answer{S_FALSE, 7, u""}));
+    // Escapes, links and relative pieces are followed.
+    EXPECT_EQ(Find(uR"(A\/B)"), (Answer{S_OK, 4, uR"(/A\/B)"}));
+    EXPECT_EQ(Find(uR"(A\/C)"), (Answer{S_FALSE, 0, u""}));
+    EXPECT_EQ(Find(u"Clock"), (Answer{S_OK, 5, u"/C0/DIO0"}));
+    EXPECT_EQ(Find(u"C0/./DIO0/../../A\\/B"), (Answer{S_OK, 20, uR"(/A\/B)"}));
+    EXPECT_EQ(Find(u".."), (Answer{S_FALSE, 0, u""}));
+}
+
+TEST_F(ResourceTreeTest, LookupsFromANodeAreRelativeUnlessTheyStartAtTheRoot) {
+    const auto connector = Object(u"C0");
+    ComPtr<IwbhwResourceTreeNode> line;
+    EXPECT_EQ(connector->FindNode(u"DIO0", nullptr, line.Put()), S_OK);
+    uint32_t matched = 0;
+    EXPECT_EQ(connector->FindNode(u"/C0/DIO0", &matched, line.Put()), S_OK);
+    EXPECT_EQ(matched, 8u);
+    EXPECT_EQ(connector->FindNode(u"C0/DIO0", &matched, line.Put()), S_FALSE);
+    EXPECT_EQ(line.Get(), nullptr);
+}
+
+TEST_F(ResourceTreeTest, ChildrenAttributesAndTypesAreTheNodesEntries) {
+    uint32_t count = 0;
+    IwbhwResourceTreeNode** children = nullptr;
+    ASSERT_EQ(Object(u"C0")->GetChildrenOfType(u"digitalline", &count, &children), S_OK);
+    ASSERT_EQ(count, 2u);
+    BSTR type = nullptr;
+    EXPECT_EQ(children[1]->GetElementType(&type), S_OK);
+    EXPECT_EQ(qv::com::BstrToString(type), u"DigitalLine");
+    SysFreeString(type);
+    BSTR name = nullptr;
+    BSTR value = nullptr;
+    EXPECT_EQ(children[1]->GetAttributeAt(0, &name, &value), S_OK);
+    EXPECT_EQ(qv::com::BstrToString(name) + u"=" + qv::com::BstrToString(value), u"Line=1");
+    SysFreeString(name);
+    SysFreeString(value);
+    EXPECT_EQ(children[1]->GetAttributeAt(1, &name, &value), S_FALSE);
+    for (uint32_t i = 0; i < count; ++i)
+        children[i]->Release();
+    CoTaskMemFree(children);
+    // Links are followed by lookups but are not children.
+    ASSERT_EQ(Object(u"")->GetChildren(&count, &children), S_OK);
+    EXPECT_EQ(count, 2u);
+    for (uint32_t i = 0; i < count; ++i)
+        children[i]->Release();
+    CoTaskMemFree(children);
 }
 
 } // namespace
