@@ -4,13 +4,10 @@
 #include "ProjectTestSupport.h"
 #include "framework/IwbChildValidator.h"
 #include "host/contracts/IwbChildPlacement.h"
-#include "provider/TIOIdentifiers.h"
-#include "session/HostSession.h"
 
 #include <gtest/gtest.h>
 
 using qv::com::ComPtr;
-using wbhost::project::ProjectItem;
 
 namespace {
 
@@ -51,17 +48,13 @@ public:
     HRESULT AllowsTargetType(const GUID&) override { return S_OK; }
 };
 
-class ChildValidationTest : public ::testing::Test {
+class ChildValidationTest : public projecttest::ModuleProjectTest {
 protected:
     void SetUp() override {
-        std::string error;
-        ASSERT_TRUE(session.Open(WBT_MODULE_PATH, &error)) << error;
-        ASSERT_TRUE(session.NewProject(u"P", &error)) << error;
-        target = session.Project()->AddTarget(u"T", scratch.Write("t.xml", kBoard), &error);
-        ASSERT_TRUE(target) << error;
+        Open(kBoard);
         validator = qv::com::QueryAs<IwbChildValidator>(session.Provider());
         ASSERT_TRUE(validator);
-        chassis = Slot(session.Project()->Root(), kChassis);
+        chassis = Slot(Project().Root(), kChassis);
     }
 
     // A new item of TYPE below PARENT whose object is a host slot.
@@ -78,9 +71,6 @@ protected:
                                          allowed);
     }
 
-    projecttest::ScratchFolder scratch;
-    wbhost::session::HostSession session;
-    ComPtr<ProjectItem> target;
     ComPtr<ProjectItem> chassis;
     ComPtr<IwbChildValidator> validator;
 };
@@ -97,23 +87,21 @@ TEST_F(ChildValidationTest, ATargetGoesBelowTheHostsItsClassSupports) {
     EXPECT_EQ(Place(kUnknown, &allowed), S_FALSE);
 
     // Below a parent whose own parent holds no sub-scope, nothing is placed.
-    const auto loose = Slot(session.Project()->Root(), kRack);
+    const auto loose = Slot(Project().Root(), kRack);
     EXPECT_EQ(validator->CheckPlacement(loose.Get(), target->Object(), &allowed), E_FAIL);
     EXPECT_EQ(allowed, 0);
 }
 
 TEST_F(ChildValidationTest, ItemsMoveOnlyWhereATargetTakesThem) {
-    wbhost::project::Project& project = *session.Project();
-    ComPtr<ProjectItem> folder;
-    ASSERT_EQ(target->CreateChild(wbproj::kFolderType, u"F", nullptr), S_OK);
-    folder = ComPtr<ProjectItem>::Share(target->Children().back().Get());
+    wbhost::project::Project& project = Project();
+    ProjectItem* folder = AddFolder(u"F");
     // Folders pass the question up to their target, which takes items of every type.
-    EXPECT_EQ(validator->ValidateChild(folder.Get(), tio::kIOItemType), S_OK);
-    EXPECT_EQ(validator->CheckItem(folder.Get()), S_OK);
+    EXPECT_EQ(validator->ValidateChild(folder, tio::kIOItemType), S_OK);
+    EXPECT_EQ(validator->CheckItem(folder), S_OK);
     // The project root has no resource tree above it: no place for a hardware item.
     EXPECT_EQ(validator->ValidateChild(&project.Root(), tio::kIOItemType), S_FALSE);
     EXPECT_EQ(validator->CheckItem(&project.Root()), S_FALSE);
-    EXPECT_EQ(project.MoveItem(*folder.Get(), project.Root()), E_ACCESSDENIED);
+    EXPECT_EQ(project.MoveItem(*folder, project.Root()), E_ACCESSDENIED);
     EXPECT_EQ(folder->Parent(), target.Get());
 }
 

@@ -5,11 +5,8 @@
 #include "cli/HostText.h"
 #include "cli/HostedModule.h"
 #include "framework/IqxProvider.h"
-#include "items/TIOItemInterfaces.h"
-#include "provider/TIOIdentifiers.h"
 #include "runtime/FailureInjection.h"
 #include "runtime/RefnumTable.h"
-#include "session/HostSession.h"
 
 #include <gtest/gtest.h>
 
@@ -18,8 +15,6 @@ using hostarrays::HostArray;
 using qv::com::ComPtr;
 using wbhost::cli::HostStringBytes;
 using wbhost::cli::NewHostString;
-using wbhost::project::ProjectItem;
-using wbhost::project::Property;
 using wbhost::runtime::FailingCall;
 using wbhost::runtime::FailNthCall;
 
@@ -49,56 +44,29 @@ std::string Cluster(std::string_view name, std::string_view value) {
            std::string(value) + "</Val></String></Cluster>";
 }
 
-class ExportsOnAProject : public ::testing::Test {
+class ExportsOnAProject : public ModuleProjectTest {
 protected:
     void SetUp() override {
-        std::string error;
-        ASSERT_TRUE(session.Open(WBT_MODULE_PATH, &error)) << error;
-        ASSERT_TRUE(session.NewProject(u"P", &error)) << error;
-        target = session.Project()->AddTarget(u"T", scratch.Write("t.xml", kBoard), &error);
-        ASSERT_TRUE(target) << error;
-        tree = Project().TargetOf(*target.Get())->Target().refnum;
+        Open(kBoard);
+        tree = Target().Target().refnum;
     }
     void TearDown() override {
         for (WBRefNum refnum : refnums_)
             wbhost::runtime::RefnumTable::Instance().Remove(refnum);
     }
 
-    template <class Fn> Fn* Export(const char* name) {
-        Fn* fn = session.Module()->Find<Fn>(name);
-        EXPECT_NE(fn, nullptr) << name;
-        return fn;
-    }
-    wbhost::project::Project& Project() { return *session.Project(); }
-    wbhost::resources::ResourceTree& Tree() {
-        return *Project().TargetOf(*target.Get())->Target().tree;
-    }
     std::u16string Attribute(std::u16string_view path, std::u16string_view name) {
         const wbhw::WString* text = Tree().Find(path)->TextAt(name);
         return text != nullptr ? std::u16string(*text) : u"<none>";
     }
     // A new item bound to RESOURCE and the refnum a host program would hold for it.
-    WBRefNum AddItem(std::u16string name, std::u16string_view resource) {
-        wbhost::project::PropertyBag::Map properties;
-        properties[u"tioAttrBag"] = Property{Property::Kind::String, ItemBag(resource), 0};
-        ComPtr<ProjectItem> made;
-        EXPECT_EQ(Project().CreateItem(*target.Get(), tio::kIOItemType, std::move(name), properties,
-                                       &made),
-                  S_OK);
-        items_.push_back(made.Get());
-        refnums_.push_back(wbhost::runtime::RefnumTable::Instance().Add(made->Object()));
+    WBRefNum AddItem(std::u16string name, const char16_t* resource) {
+        items_.push_back(ModuleProjectTest::AddItem(std::move(name), resource));
+        refnums_.push_back(wbhost::runtime::RefnumTable::Instance().Add(items_.back()->Object()));
         return refnums_.back();
     }
-    std::u16string Resource(size_t item) {
-        BSTR path = nullptr;
-        qv::com::QueryAs<IwbhwResourceItemUI>(items_[item]->Object())->GetResourcePath(&path);
-        const qv::com::UniqueBstr held(path);
-        return qv::com::BstrToString(path);
-    }
+    std::u16string Resource(size_t item) { return ModuleProjectTest::Resource(items_[item]); }
 
-    ScratchFolder scratch;
-    wbhost::session::HostSession session;
-    ComPtr<ProjectItem> target;
     WBRefNum tree = 0;
     std::vector<ProjectItem*> items_;
     std::vector<WBRefNum> refnums_;
@@ -207,9 +175,7 @@ TEST_F(ExportsOnAProject, EditsInsertRemoveAndSetPropertiesWhereThePathLeavesThe
     ASSERT_EQ(remove(&tree, NewHostString("C0").get(), NewHostString("DIO7").get(), &found), S_OK);
     EXPECT_EQ(found, 1);
     EXPECT_EQ(Tree().Find(u"/C0/DIO7"), nullptr);
-    int32_t status = -1;
-    qv::com::QueryAs<IwbTIOInstanceItemUI>(items_[0]->Object())->GetResourceStatus(&status);
-    EXPECT_EQ(status, 1);
+    EXPECT_EQ(Status(items_[0]), 1);
 }
 
 TEST_F(ExportsOnAProject, AttributesReachOneItemOrOneTextEachOfSeveral) {

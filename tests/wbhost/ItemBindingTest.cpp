@@ -3,16 +3,11 @@
 #include "ProjectTestSupport.h"
 #include "framework/IqxItemUI.h"
 #include "framework/IwbCompileConfiguration.h"
-#include "items/TIOItemInterfaces.h"
-#include "provider/TIOIdentifiers.h"
-#include "session/HostSession.h"
 
 #include <gtest/gtest.h>
 
 using namespace projecttest;
 using qv::com::ComPtr;
-using wbhost::project::ProjectItem;
-using wbhost::project::Property;
 
 namespace {
 
@@ -40,85 +35,23 @@ constexpr const char* kBoard = R"(<Target>
 </Target>
 )";
 
-// The attribute-set text of a new item using RESOURCE.
-std::u16string BagFor(std::u16string_view resource) {
-    return u"<AttributeSet name=\"\">\n<Attribute name=\"resource\">\n<Value>" +
-           std::u16string(resource) + u"</Value>\n</Attribute>\n</AttributeSet>\n";
-}
-
-class ItemBindingTest : public ::testing::Test {
+class ItemBindingTest : public ModuleProjectTest {
 protected:
-    void SetUp() override {
-        std::string error;
-        ASSERT_TRUE(session.Open(WBT_MODULE_PATH, &error)) << error;
-        ASSERT_TRUE(session.NewProject(u"P", &error)) << error;
-        target = session.Project()->AddTarget(u"T", scratch.Write("t.xml", kBoard), &error);
-        ASSERT_TRUE(target) << error;
-    }
+    void SetUp() override { Open(kBoard); }
 
-    wbhost::project::Project& Project() { return *session.Project(); }
-    wbhost::resources::ResourceTree& Tree() {
-        return *Project().TargetOf(*target.Get())->Target().tree;
-    }
-    wbhw::ResTreeNode& Node(std::u16string_view path) {
-        wbhw::ResTreeNode* node = Tree().Find(path);
-        EXPECT_NE(node, nullptr) << "no node at the path";
-        return node != nullptr ? *node : Tree().Root();
-    }
-
-    // A new item NAME below PARENT (the target when null) whose stored bag uses RESOURCE, or no
-    // bag at all when RESOURCE is null.
-    ProjectItem* AddItem(std::u16string name, const char16_t* resource,
-                         ProjectItem* parent = nullptr) {
-        wbhost::project::PropertyBag::Map properties;
-        if (resource != nullptr)
-            properties[u"tioAttrBag"] = Property{Property::Kind::String, BagFor(resource), 0};
-        ComPtr<ProjectItem> made;
-        EXPECT_EQ(Project().CreateItem(parent ? *parent : *target.Get(), tio::kIOItemType,
-                                       std::move(name), properties, &made),
-                  S_OK);
-        return made.Get();
-    }
-
-    static int32_t Int(ProjectItem* item, const char16_t* name, int32_t absent = -1) {
-        int32_t value = absent;
-        return item->Bag().GetInt(name, &value) == S_OK ? value : absent;
-    }
-    static int32_t Status(ProjectItem* item) { return Int(item, u"tioResourceStatus"); }
     static int32_t Version(ProjectItem* item) { return Int(item, u"tioFeatureSetVersion", 0); }
-    static std::u16string StoredBag(ProjectItem* item) {
-        BSTR text = nullptr;
-        item->Bag().GetString(u"tioAttrBag", &text);
-        const qv::com::UniqueBstr held(text);
-        return qv::com::BstrToString(text);
-    }
-    template <class I> static ComPtr<I> As(ProjectItem* item) {
-        return qv::com::QueryAs<I>(item->Object());
-    }
-    static std::u16string Resource(ProjectItem* item) {
-        BSTR path = nullptr;
-        As<IwbhwResourceItemUI>(item)->GetResourcePath(&path);
-        const qv::com::UniqueBstr held(path);
-        return qv::com::BstrToString(path);
-    }
     static std::u16string Config(IUnknown* object) {
         BSTR text = nullptr;
         EXPECT_EQ(qv::com::QueryAs<IwbCompileConfiguration>(object)->GetCompileConfiguration(&text),
                   S_OK);
-        const qv::com::UniqueBstr held(text);
-        return qv::com::BstrToString(text);
+        return TakeText(text);
     }
     static std::u16string Icon(ProjectItem* item) {
         BSTR name = nullptr;
         As<IqxItemUI>(item)->GetIconName(&name);
-        const qv::com::UniqueBstr held(name);
-        return qv::com::BstrToString(name);
+        return TakeText(name);
     }
-    size_t OwnerHeard() { return Project().TargetOf(*target.Get())->Changed().size(); }
-
-    ScratchFolder scratch;
-    wbhost::session::HostSession session;
-    ComPtr<ProjectItem> target;
+    size_t OwnerHeard() { return Target().Changed().size(); }
 };
 
 TEST_F(ItemBindingTest, AnItemFollowsItsResourceThroughRenamesRemovalAndReturn) {
@@ -228,13 +161,7 @@ TEST_F(ItemBindingTest, AnItemWithoutABagIsMissingAndAnUnchangedBagIsNotWrittenA
 }
 
 TEST_F(ItemBindingTest, AReopenedProjectBindsEveryItemBackAndKeepsOneThatCannotBind) {
-    ProjectItem* folder = nullptr;
-    {
-        ComPtr<ProjectItem> made;
-        ASSERT_EQ(Project().CreateItem(*target.Get(), wbproj::kFolderType, u"Sub", {}, &made),
-                  S_OK);
-        folder = made.Get();
-    }
+    ProjectItem* folder = AddFolder(u"Sub");
     AddItem(u"A", u"/C0/DIO2");
     AddItem(u"B", u"/C0/DIO2", folder);
     ProjectItem* broken = AddItem(u"C", u"/C0/DIO0");
@@ -246,16 +173,10 @@ TEST_F(ItemBindingTest, AReopenedProjectBindsEveryItemBackAndKeepsOneThatCannotB
     const std::string saved = wbhost::project::FormatProject(Project().Snapshot());
 
     ASSERT_TRUE(session.OpenProject(file, &error)) << error;
-    ProjectItem& reopened = *Project().Targets().front().Get();
-    auto child = [](ProjectItem& parent, std::u16string_view name) {
-        for (const auto& each : parent.Children())
-            if (each->Name() == name)
-                return each.Get();
-        return static_cast<ProjectItem*>(nullptr);
-    };
-    EXPECT_EQ(Status(child(reopened, u"A")), 0);
-    EXPECT_EQ(Status(child(*child(reopened, u"Sub"), u"B")), 2);
-    ProjectItem* kept = child(reopened, u"C");
+    ProjectItem* reopened = Project().Targets().front().Get();
+    EXPECT_EQ(Status(At({u"A"}, reopened)), 0);
+    EXPECT_EQ(Status(At({u"Sub", u"B"}, reopened)), 2);
+    ProjectItem* kept = At({u"C"}, reopened);
     ASSERT_NE(kept, nullptr);
     EXPECT_TRUE(FAILED(kept->BindStatus()));
     EXPECT_EQ(StoredBag(kept), u"<AttributeSet");
@@ -268,7 +189,7 @@ TEST_F(ItemBindingTest, FailingHostCallsComeBackAsStatusesAndLoseNothing) {
     ComPtr<ProjectItem> refused;
     EXPECT_EQ(Project().CreateItem(
                   *target.Get(), tio::kIOItemType, u"A",
-                  {{u"tioAttrBag", Property{Property::Kind::String, BagFor(u"/C0/DIO0"), 0}}},
+                  {{u"tioAttrBag", Property{Property::Kind::String, ItemBag(u"/C0/DIO0"), 0}}},
                   &refused),
               E_ACCESSDENIED);
     EXPECT_TRUE(target->Children().empty());

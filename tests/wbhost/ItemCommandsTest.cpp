@@ -8,20 +8,15 @@
 #include "framework/IwbProjectCutCopyPaste3.h"
 #include "framework/IwbProjectDragDrop.h"
 #include "items/TIOItemCommands.h"
-#include "items/TIOItemInterfaces.h"
 #include "kern/GuidText.h"
 #include "kern/Utf8.h"
 #include "project/DragData.h"
-#include "provider/TIOIdentifiers.h"
 #include "runtime/HostFolder.h"
-#include "session/HostSession.h"
 
 #include <gtest/gtest.h>
 
 using namespace projecttest;
 using qv::com::ComPtr;
-using wbhost::project::ProjectItem;
-using wbhost::project::Property;
 using wbhost::runner::HostReference;
 using wbhost::runner::ProgramRun;
 using wbhost::runner::ProgramValue;
@@ -50,11 +45,6 @@ constexpr const char* kBareBoard = R"(<Target>
 </Target>
 )";
 
-std::u16string BagFor(std::u16string_view resource) {
-    return u"<AttributeSet name=\"\">\n<Attribute name=\"resource\">\n<Value>" +
-           std::u16string(resource) + u"</Value>\n</Attribute>\n</AttributeSet>\n";
-}
-
 // One attribute as the properties dialog hands it back.
 std::u16string Cluster(std::u16string_view name, std::u16string_view value) {
     return u"<Cluster><Name></Name><NumElts>2</NumElts><String><Name>name</Name><Val>" +
@@ -67,53 +57,14 @@ struct Menu {
     std::vector<QxMenuEntry> entries;
 };
 
-class ItemCommandsTest : public ::testing::Test {
+class ItemCommandsTest : public ModuleProjectTest {
 protected:
     void SetUp() override {
-        std::string error;
-        ASSERT_TRUE(session.Open(WBT_MODULE_PATH, &error)) << error;
-        ASSERT_TRUE(session.NewProject(u"P", &error)) << error;
-        target = session.Project()->AddTarget(u"T", scratch.Write("t.xml", kBoard), &error);
-        ASSERT_TRUE(target) << error;
-        other = session.Project()->AddTarget(u"U", scratch.Write("u.xml", kBareBoard), &error);
-        ASSERT_TRUE(other) << error;
+        Open(kBoard);
+        other = AddTarget(u"U", kBareBoard);
     }
 
-    wbhost::project::Project& Project() { return *session.Project(); }
     wbhost::runner::ProgramSession& Programs() { return session.Programs(); }
-
-    ProjectItem* AddItem(std::u16string name, const char16_t* resource,
-                         ProjectItem* parent = nullptr) {
-        wbhost::project::PropertyBag::Map properties;
-        properties[u"tioAttrBag"] = Property{Property::Kind::String, BagFor(resource), 0};
-        ComPtr<ProjectItem> made;
-        EXPECT_EQ(Project().CreateItem(parent ? *parent : *target.Get(), tio::kIOItemType,
-                                       std::move(name), properties, &made),
-                  S_OK);
-        return made.Get();
-    }
-    template <class I> static ComPtr<I> As(ProjectItem* item) {
-        return qv::com::QueryAs<I>(item->Object());
-    }
-    static std::u16string Text(BSTR text) {
-        const qv::com::UniqueBstr held(text);
-        return qv::com::BstrToString(text);
-    }
-    static std::u16string Resource(ProjectItem* item) {
-        BSTR path = nullptr;
-        As<IwbhwResourceItemUI>(item)->GetResourcePath(&path);
-        return Text(path);
-    }
-    static std::u16string StoredBag(ProjectItem* item) {
-        BSTR text = nullptr;
-        item->Bag().GetString(u"tioAttrBag", &text);
-        return Text(text);
-    }
-    static int32_t Status(ProjectItem* item) {
-        int32_t status = -1;
-        As<IwbTIOInstanceItemUI>(item)->GetResourceStatus(&status);
-        return status;
-    }
     static Menu MenuOf(ProjectItem* item) {
         uint32_t count = 0;
         QxMenuEntry* entries = nullptr;
@@ -121,7 +72,7 @@ protected:
         Menu menu;
         for (uint32_t i = 0; i < count; ++i) {
             menu.entries.push_back(entries[i]);
-            menu.texts.push_back(Text(entries[i].text));
+            menu.texts.push_back(TakeText(entries[i].text));
         }
         CoTaskMemFree(entries);
         return menu;
@@ -146,9 +97,6 @@ protected:
         return reference != nullptr && reference->value != 0 && item != nullptr;
     }
 
-    ScratchFolder scratch;
-    wbhost::session::HostSession session;
-    ComPtr<ProjectItem> target;
     ComPtr<ProjectItem> other;
 };
 
@@ -272,7 +220,7 @@ TEST_F(ItemCommandsTest, HelpFallsBackTwiceAndComesOutBelowTheHostFolder) {
     auto help = [](ProjectItem* item) {
         BSTR path = nullptr, topic = nullptr, context = nullptr;
         EXPECT_EQ(As<IqxItemUI>(item)->GetHelp(&path, &topic, &context), S_OK);
-        return std::array{Text(path), Text(topic), Text(context)};
+        return std::array{TakeText(path), TakeText(topic), TakeText(context)};
     };
     using Help = std::array<std::u16string, 3>;
     EXPECT_EQ(help(AddItem(u"A", u"/C0/DIO0")),
@@ -287,16 +235,14 @@ TEST_F(ItemCommandsTest, HelpFallsBackTwiceAndComesOutBelowTheHostFolder) {
     BSTR file = nullptr, topic = nullptr;
     uint32_t kind = 0;
     ASSERT_EQ(As<IqxItemUI>(plain)->GetDefaultHelp(&file, &topic, &kind), S_OK);
-    EXPECT_EQ(Text(file), u"wbfpgaconcepts.chm");
-    EXPECT_EQ(Text(topic), u"Performing_Basic_I_O.html");
+    EXPECT_EQ(TakeText(file), u"wbfpgaconcepts.chm");
+    EXPECT_EQ(TakeText(topic), u"Performing_Basic_I_O.html");
     EXPECT_EQ(kind, 5u);
 }
 
 TEST_F(ItemCommandsTest, APhysicalItemIsDroppedOnlyWithinItsTargetAndTheDropProgramGetsItsPlace) {
-    ComPtr<ProjectItem> folder;
-    ASSERT_EQ(Project().CreateItem(*target.Get(), wbproj::kFolderType, u"Pumps", {}, &folder),
-              S_OK);
-    ProjectItem* item = AddItem(u"Valve", u"/C0/DIO0", folder.Get());
+    ProjectItem* folder = AddFolder(u"Pumps");
+    ProjectItem* item = AddItem(u"Valve", u"/C0/DIO0", folder);
     const auto drag = Make<wbhost::project::DragDataImpl>(
         std::vector<ComPtr<IwbProjectItem>>{ComPtr<IwbProjectItem>::Share(item)});
     const auto dragDrop = As<IwbProjectDragDrop>(item);

@@ -4,10 +4,7 @@
 #include "cli/AttributeSet.h"
 #include "cli/HostStringList.h"
 #include "cli/HostText.h"
-#include "cli/HostedModule.h"
-#include "provider/TIOIdentifiers.h"
 #include "runtime/RefnumTable.h"
-#include "session/HostSession.h"
 #include "session/NewItemWizard.h"
 
 #include <gtest/gtest.h>
@@ -15,7 +12,6 @@
 using namespace projecttest;
 using qv::com::ComPtr;
 using wbhost::cli::NewItemAttributeSet;
-using wbhost::project::ProjectItem;
 
 namespace {
 
@@ -34,19 +30,13 @@ using CreateMultipleFn = int32_t(const WBRefNum*, WBHandle*);
 // A name taken where the new item or one of its folders would go.
 constexpr int32_t kNameTaken = static_cast<int32_t>(0x800700B7);
 
-class ItemCreationTest : public ::testing::Test {
+class ItemCreationTest : public ModuleProjectTest {
 protected:
     void SetUp() override {
-        std::string error;
-        ASSERT_TRUE(session.Open(WBT_MODULE_PATH, &error)) << error;
-        ASSERT_TRUE(session.NewProject(u"P", &error)) << error;
-        target = session.Project()->AddTarget(u"T", scratch.Write("t.xml", kBoard), &error);
-        ASSERT_TRUE(target) << error;
-        createMultiple = session.Module()->Find<CreateMultipleFn>("TIO_CreateMultiple");
+        Open(kBoard);
+        createMultiple = Export<CreateMultipleFn>("TIO_CreateMultiple");
         ASSERT_NE(createMultiple, nullptr);
     }
-
-    wbhost::project::TargetObject& Target() { return *session.Project()->TargetOf(*target.Get()); }
 
     // TIO_CreateMultiple below the item PARENT with one definition per (name, resource).
     int32_t CreateMultiple(ProjectItem& parent,
@@ -66,30 +56,8 @@ protected:
         return status;
     }
 
-    // The item at PATH (names below PARENT, the target when null); null when absent.
-    ProjectItem* At(std::vector<std::u16string> path, ProjectItem* parent = nullptr) {
-        ProjectItem* at = parent ? parent : target.Get();
-        for (const auto& name : path) {
-            ProjectItem* next = nullptr;
-            for (const auto& child : at->Children())
-                if (child->Name() == name)
-                    next = child.Get();
-            if (next == nullptr)
-                return nullptr;
-            at = next;
-        }
-        return at;
-    }
-    static int32_t Status(ProjectItem* item) {
-        int32_t value = -1;
-        item->Bag().GetInt(u"tioResourceStatus", &value);
-        return value;
-    }
     static bool Shown(ProjectItem* item) { return (item->Flags() & wbproj::kShownFlag) != 0; }
 
-    ScratchFolder scratch;
-    wbhost::session::HostSession session;
-    ComPtr<ProjectItem> target;
     CreateMultipleFn* createMultiple = nullptr;
 };
 

@@ -2,15 +2,10 @@
 // the host's program log and injected failures can be looked at: unique names through the host's
 // unique-name program, and a move whose rebinding fails.
 #include "ProjectTestSupport.h"
-#include "items/TIOItemInterfaces.h"
-#include "provider/TIOIdentifiers.h"
-#include "session/HostSession.h"
 
 #include <gtest/gtest.h>
 
 using qv::com::ComPtr;
-using wbhost::project::ProjectItem;
-using wbhost::project::Property;
 
 namespace {
 
@@ -20,28 +15,11 @@ constexpr const char* kBoard = R"(<Target>
 </Target>
 )";
 
-class ItemScopeTest : public ::testing::Test {
+class ItemScopeTest : public projecttest::ModuleProjectTest {
 protected:
     void SetUp() override {
-        std::string error;
-        ASSERT_TRUE(session.Open(WBT_MODULE_PATH, &error)) << error;
-        ASSERT_TRUE(session.NewProject(u"P", &error)) << error;
-        const std::string file = scratch.Write("t.xml", kBoard);
-        t = session.Project()->AddTarget(u"T", file, &error);
-        u = session.Project()->AddTarget(u"U", file, &error);
-        ASSERT_TRUE(t && u) << error;
-    }
-    ProjectItem* Add(ProjectItem& parent, std::u16string name, std::u16string_view resource) {
-        const std::u16string bag = u"<AttributeSet name=\"\">\n<Attribute name=\"resource\">\n"
-                                   u"<Value>" +
-                                   std::u16string(resource) +
-                                   u"</Value>\n</Attribute>\n</AttributeSet>\n";
-        ComPtr<ProjectItem> made;
-        EXPECT_EQ(session.Project()->CreateItem(
-                      parent, tio::kIOItemType, std::move(name),
-                      {{u"tioAttrBag", Property{Property::Kind::String, bag, 0}}}, &made),
-                  S_OK);
-        return made.Get();
+        Open(kBoard);
+        u = AddTarget(u"U", kBoard);
     }
     // What ITEM's object makes of PROPOSED.
     std::u16string Unique(ProjectItem* item, const char16_t* proposed) {
@@ -49,21 +27,16 @@ protected:
         EXPECT_EQ(qv::com::QueryAs<IwbTIOItemUIPrivate>(item->Object())
                       ->GenerateUniqueName(proposed, &unique),
                   S_OK);
-        const qv::com::UniqueBstr held(unique);
-        return qv::com::BstrToString(unique);
+        return projecttest::TakeText(unique);
     }
 
-    projecttest::ScratchFolder scratch;
-    wbhost::session::HostSession session;
-    ComPtr<ProjectItem> t;
     ComPtr<ProjectItem> u;
 };
 
 TEST_F(ItemScopeTest, UniqueNamesAskTheHostOnlyForATakenName) {
-    ProjectItem* pump = Add(*t.Get(), u"Pump", u"/DIO0");
-    ASSERT_EQ(t->CreateChild(wbproj::kFolderType, u"F", nullptr), S_OK);
-    Add(*t->Children().back().Get(), u"pump1", u"/DIO1");
-    ProjectItem* other = Add(*u.Get(), u"Valve", u"/DIO0");
+    ProjectItem* pump = AddItem(u"Pump", u"/DIO0");
+    AddItem(u"pump1", u"/DIO1", AddFolder(u"F"));
+    ProjectItem* other = AddItem(u"Valve", u"/DIO0", u.Get());
 
     EXPECT_EQ(Unique(other, u"Pump"), u"Pump"); // another scope: free, the program not run
     EXPECT_TRUE(session.Programs().Runs().empty());
@@ -78,12 +51,12 @@ TEST_F(ItemScopeTest, UniqueNamesAskTheHostOnlyForATakenName) {
 }
 
 TEST_F(ItemScopeTest, AMoveWhoseBindingFailsAnswersTheStatusAndKeepsWhatWasStored) {
-    ProjectItem* pump = Add(*t.Get(), u"Pump", u"/DIO0");
-    Add(*u.Get(), u"Valve", u"/DIO0"); // U's DIO0 is held: the moved item's status would change
+    ProjectItem* pump = AddItem(u"Pump", u"/DIO0");
+    AddItem(u"Valve", u"/DIO0", u.Get()); // U's DIO0 is held: the moved item's status would change
     const auto stored = pump->Bag().Properties();
     const HRESULT diskFull = static_cast<HRESULT>(0x80070070);
     pump->Bag().FailWrites(diskFull);
-    EXPECT_EQ(session.Project()->MoveItem(*pump, *u.Get()), diskFull);
+    EXPECT_EQ(Project().MoveItem(*pump, *u.Get()), diskFull);
     EXPECT_EQ(pump->Bag().Properties(), stored);
 }
 

@@ -3,13 +3,11 @@
 // program through the engine table this host exports.
 #include "ProjectTestSupport.h"
 #include "VariantText.h"
-#include "cli/HostedModule.h"
 #include "com/TaskMem.h"
 #include "host/contracts/IwbProjectNameProvider.h"
 #include "runtime/FailureInjection.h"
 #include "runtime/HostStrings.h"
 #include "runtime/Runtime.h"
-#include "session/HostSession.h"
 
 #include <cstring>
 #include <gtest/gtest.h>
@@ -70,15 +68,11 @@ std::vector<Entry> TakeList(WBHandle list) {
     return entries;
 }
 
-class NameControlTest : public ::testing::Test {
+class NameControlTest : public ModuleProjectTest {
 protected:
     void SetUp() override {
-        std::string error;
-        ASSERT_TRUE(session.Open(WBT_MODULE_PATH, &error)) << error;
-        ASSERT_TRUE(session.NewProject(u"P", &error)) << error;
-        target = session.Project()->AddTarget(u"T", scratch.Write("t.xml", kDescription), &error);
-        ASSERT_TRUE(target) << error;
-        appRef = session.Project()->TargetOf(*target.Get())->Target().refnum;
+        Open(kDescription);
+        appRef = Target().Target().refnum;
         names = qv::com::QueryAs<IwbProjectNameProvider>(session.Provider());
         ASSERT_TRUE(names);
     }
@@ -104,9 +98,6 @@ protected:
         return TakeList(list);
     }
 
-    ScratchFolder scratch;
-    wbhost::session::HostSession session;
-    ComPtr<wbhost::project::ProjectItem> target;
     WBRefNum appRef = 0;
     ComPtr<IwbProjectNameProvider> names;
     wbhost::runtime::FailureScope failures;
@@ -197,8 +188,8 @@ TEST_F(NameControlTest, TheControlsProgramsRunUnlessTheControlHadAValue) {
 
 TEST_F(NameControlTest, OldControlDataIsUpgradedByTheHostsLibraryProgram) {
     using MutationFn = int32_t(void*, uint32_t, void*, int32_t);
-    auto* mutate = session.Module()->Find<MutationFn>("IONameControlOnMutation");
-    auto* getNames = session.Module()->Find<int32_t()>("GetIOControlNames");
+    auto* mutate = Export<MutationFn>("IONameControlOnMutation");
+    auto* getNames = Export<int32_t()>("GetIOControlNames");
     ASSERT_NE(mutate, nullptr);
     ASSERT_NE(getNames, nullptr);
     EXPECT_EQ(getNames(), 0);
