@@ -1,6 +1,7 @@
 // Drives host strings and string arrays with a script read from the input: writes, resizes,
 // element reads and writes, blocks with arbitrary counts. Every result is checked against a plain
 // model, and every host handle must be given back at the end.
+#include "FuzzCheck.h"
 #include "host/HostStringArray.h"
 #include "host/errors/WBErrorException.h"
 #include "runtime/HandleTable.h"
@@ -37,11 +38,7 @@ private:
     size_t pos_ = 0;
 };
 
-void Check(bool condition) {
-    if (!condition) {
-        std::abort();
-    }
-}
+using wbt::fuzz::Check;
 
 template <class Action> bool Raises(Action action) {
     try {

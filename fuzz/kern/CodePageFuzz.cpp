@@ -1,5 +1,6 @@
 // Code-page conversion of arbitrary bytes and UTF-16 units in each page the module names. A text
 // converted to a page and back settles after one round: converting it again changes nothing.
+#include "FuzzCheck.h"
 #include "kern/CodePage.h"
 
 #include <cstdint>
@@ -11,10 +12,7 @@ namespace {
 
 constexpr std::string_view kPages[] = {"", "US-ASCII", "cp932"};
 
-void Check(bool condition) {
-    if (!condition)
-        std::abort();
-}
+using wbt::fuzz::Check;
 
 } // namespace
 

@@ -2,6 +2,7 @@
 // comparison export hand them over. The answer is one of the three results, the same when the
 // pair is asked again (from the cache) and when it is explained (a fresh comparison), and a
 // description always matches itself.
+#include "FuzzCheck.h"
 #include "FuzzSupport.h"
 #include "resource_tree/ResourceCompare.h"
 
@@ -11,10 +12,7 @@
 
 namespace {
 
-void Check(bool condition) {
-    if (!condition)
-        std::abort();
-}
+using wbt::fuzz::Check;
 
 } // namespace
 

@@ -1,5 +1,6 @@
 // Answers as the command line takes them: one "--answer" text, or an answer file of any bytes.
 // A refused answer says why, and an accepted one is there for its behaviour afterwards.
+#include "FuzzCheck.h"
 #include "cli/Answers.h"
 
 #include <cstdint>
@@ -11,10 +12,7 @@
 
 namespace {
 
-void Check(bool condition) {
-    if (!condition)
-        std::abort();
-}
+using wbt::fuzz::Check;
 
 const std::string& AnswerFile() {
     static const std::string path = [] {

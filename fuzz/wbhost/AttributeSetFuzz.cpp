@@ -1,6 +1,7 @@
 // The host's attribute-set reader, on arbitrary text and on the sets the host writes for new
 // items: a written set reads back as exactly the name and resource it was written with.
 #include "../attribute_bag/FuzzText.h"
+#include "FuzzCheck.h"
 #include "cli/AttributeSet.h"
 
 #include <cstdint>
@@ -9,10 +10,7 @@
 
 namespace {
 
-void Check(bool condition) {
-    if (!condition)
-        std::abort();
-}
+using wbt::fuzz::Check;
 
 // Whether XML can carry C at all (a set holding anything else is not well formed).
 bool XmlCharacter(char16_t c) {

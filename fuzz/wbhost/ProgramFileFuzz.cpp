@@ -1,5 +1,6 @@
 // The host's program-file (".gx") reader on arbitrary text: a file it accepts names a behaviour,
 // which is also among its keys, and every key and value is trimmed.
+#include "FuzzCheck.h"
 #include "runner/ProgramFile.h"
 
 #include <cstdint>
@@ -8,10 +9,7 @@
 
 namespace {
 
-void Check(bool condition) {
-    if (!condition)
-        std::abort();
-}
+using wbt::fuzz::Check;
 
 bool Trimmed(std::string_view text) {
     const auto blank = [](char c) { return c == ' ' || c == '\t' || c == '\r'; };

@@ -1,5 +1,6 @@
 // The host's project-file reader on arbitrary text. A text it accepts is written back in the
 // same form and reads again into the same project, and the escaped fields round-trip on their own.
+#include "FuzzCheck.h"
 #include "project/ProjectFormat.h"
 
 #include <cstdint>
@@ -13,10 +14,7 @@ namespace {
 using wbhost::project::SavedItem;
 using wbhost::project::SavedProject;
 
-void Check(bool condition) {
-    if (!condition)
-        std::abort();
-}
+using wbt::fuzz::Check;
 
 bool SameItem(const SavedItem& a, const SavedItem& b) {
     return std::memcmp(&a.id, &b.id, sizeof a.id) == 0 &&
