@@ -1,7 +1,6 @@
 // `wbhost project add-item` through the module's wizard and `project add-items` in one bulk
 // creation, through the build's module.
 #include "CliTestSupport.h"
-#include "cli/ProjectCommands.h"
 
 using clitest::Options;
 using clitest::ScratchProject;
@@ -22,9 +21,7 @@ constexpr const char* kBoard = R"(<Target>
 struct BulkProject : ScratchProject {
     BulkProject() {
         description = scratch.Write("t.xml", kBoard);
-        Run([&](std::ostream& o, std::ostream& e) {
-            return RunProjectNew(Options(), path, {"T=" + description}, true, o, e);
-        });
+        New({"T=" + description}, true);
     }
     int AddItems(const std::string& list) {
         const std::string file = scratch.Write("list.txt", list);
@@ -32,15 +29,8 @@ struct BulkProject : ScratchProject {
             return RunAddItems(Options(), path, "T", file, o, e);
         });
     }
-    int Add(const AddItemRequest& request, HostOptions options = Options()) {
-        return Run([&](std::ostream& o, std::ostream& e) {
-            return RunAddItem(options, path, request, o, e);
-        });
-    }
     std::string Listing() {
-        Run([&](std::ostream& o, std::ostream& e) {
-            return RunProjectList(Options(), path, o, e);
-        });
+        List();
         return out.str();
     }
 };

@@ -2,9 +2,8 @@
 #include "CliTestSupport.h"
 #include "cli/Commands.h"
 #include "cli/EditCommands.h"
-#include "cli/ProjectCommands.h"
 
-#include <nlohmann/json.hpp>
+#include <map>
 
 using clitest::Options;
 using clitest::ScratchProject;
@@ -16,27 +15,8 @@ namespace {
 class CliEdit : public ::testing::Test {
 protected:
     void SetUp() override {
-        ASSERT_EQ(p.Run([&](std::ostream& out, std::ostream& err) {
-            return RunProjectNew(Options(), p.path, {"T=" + p.description}, false, out, err);
-        }),
-                  kProjectOk)
-            << p.err.str();
-        ASSERT_EQ(p.Run([&](std::ostream& out, std::ostream& err) {
-            return RunAddItem(Options(), p.path, {"T", "DIO0", "Valve"}, out, err);
-        }),
-                  kProjectOk)
-            << p.err.str();
-    }
-    int Edit(const std::string& action, const std::vector<std::string>& arguments) {
-        EditRequest request{"T", EditKind::Rename, "", "", ""};
-        std::string error;
-        if (!ParseEdit(action, arguments, request, error)) {
-            p.err << error;
-            return -1;
-        }
-        return p.Run([&](std::ostream& out, std::ostream& err) {
-            return RunEdit(Options(), p.path, request, out, err);
-        });
+        ASSERT_EQ(p.New({"T=" + p.description}), kProjectOk) << p.err.str();
+        ASSERT_EQ(p.Add({"T", "DIO0", "Valve"}), kProjectOk) << p.err.str();
     }
     // The dump of the node PATH of the tree the project now refers to; empty when absent.
     std::string KeptNode(const std::string& path) {
@@ -79,16 +59,16 @@ TEST(CliEditParse, KeptDescriptionNamesArePlainFileNames) {
 
 TEST_F(CliEdit, EditsReachTheReopenedProjectAndNeverTheOriginalDescription) {
     const std::string original = Slurp(p.description);
-    ASSERT_EQ(Edit("rename", {"DIO0", "Valve0"}), 0) << p.err.str();
+    ASSERT_EQ(p.Edit("rename", {"DIO0", "Valve0"}), 0) << p.err.str();
     EXPECT_NE(p.out.str().find("renamed /DIO0 to \"Valve0\""), std::string::npos);
     EXPECT_NE(p.out.str().find("Tangent I/O item \"Valve\""), std::string::npos) << p.out.str();
     EXPECT_NE(Slurp(p.path).find(EditedDescriptionPath(p.path, u"T")), std::string::npos);
 
     // The second edit starts from the first one's tree, read back through the project.
-    ASSERT_EQ(Edit("remove", {"AI0"}), 0) << p.err.str();
+    ASSERT_EQ(p.Edit("remove", {"AI0"}), 0) << p.err.str();
     const std::string part = p.scratch.Write(
         "part.xml", "<Line name=\"DIO1\"><IOInterface>DigitalLine</IOInterface></Line>");
-    ASSERT_EQ(Edit("insert", {"/", part}), 0) << p.err.str();
+    ASSERT_EQ(p.Edit("insert", {"/", part}), 0) << p.err.str();
     EXPECT_NE(KeptNode("Valve0"), "");
     EXPECT_EQ(KeptNode("DIO0"), "");
     EXPECT_EQ(KeptNode("AI0"), "");
@@ -96,36 +76,23 @@ TEST_F(CliEdit, EditsReachTheReopenedProjectAndNeverTheOriginalDescription) {
     EXPECT_EQ(Slurp(p.description), original);
 
     // Items can be added for what was inserted.
-    EXPECT_EQ(p.Run([&](std::ostream& out, std::ostream& err) {
-        return RunAddItem(Options(), p.path, {"T", "DIO1", ""}, out, err);
-    }),
-              kProjectOk)
-        << p.err.str();
+    EXPECT_EQ(p.Add({"T", "DIO1", ""}), kProjectOk) << p.err.str();
 }
 
 TEST_F(CliEdit, AttributeEditsAreKeptAndTheItemsStateIsListed) {
-    ASSERT_EQ(p.Run([&](std::ostream& out, std::ostream& err) {
-        return RunAddItem(Options(), p.path, {"T", "AI0", "Sensors/Level"}, out, err);
-    }),
-              kProjectOk)
-        << p.err.str();
-    ASSERT_EQ(Edit("set-attribute", {"DIO0", "HiddenTIO", "TRUE"}), 0) << p.err.str();
+    ASSERT_EQ(p.Add({"T", "AI0", "Sensors/Level"}), kProjectOk) << p.err.str();
+    ASSERT_EQ(p.Edit("set-attribute", {"DIO0", "HiddenTIO", "TRUE"}), 0) << p.err.str();
     EXPECT_NE(p.out.str().find("set HiddenTIO=\"TRUE\" on /DIO0"), std::string::npos);
     // Every edit ends with what each item reports, folders in its path.
     EXPECT_NE(p.out.str().find("  Sensors/Level: "), std::string::npos) << p.out.str();
-    ASSERT_EQ(Edit("set-attribute", {"DIO0", "Note", "a & b <c>"}), 0) << p.err.str();
+    ASSERT_EQ(p.Edit("set-attribute", {"DIO0", "Note", "a & b <c>"}), 0) << p.err.str();
     EXPECT_NE(KeptNode("DIO0").find("<HiddenTIO>TRUE</HiddenTIO>"), std::string::npos);
-    ASSERT_EQ(Edit("remove-attribute", {"DIO0", "hiddentio"}), 0) << p.err.str();
+    ASSERT_EQ(p.Edit("remove-attribute", {"DIO0", "hiddentio"}), 0) << p.err.str();
     const std::string node = KeptNode("DIO0");
     EXPECT_EQ(node.find("HiddenTIO"), std::string::npos) << node;
     EXPECT_NE(node.find("<Note>a &amp; b &lt;c&gt;</Note>"), std::string::npos) << node;
 
-    ASSERT_EQ(p.Run([&](std::ostream& out, std::ostream& err) {
-        return RunProjectJson(Options(), p.path, out, err);
-    }),
-              kProjectOk)
-        << p.err.str();
-    const auto listing = nlohmann::json::parse(p.out.str());
+    const auto listing = p.Json();
     ASSERT_EQ(listing["targets"].size(), 1u);
     const auto& items = listing["targets"][0]["items"];
     ASSERT_EQ(items.size(), 2u) << listing.dump(2);
@@ -160,13 +127,90 @@ TEST_F(CliEdit, RefusedEditsChangeNoFile) {
         {"set-attribute", {"DIO9", "A", "x"}, "no node"},
     };
     for (const auto& each : refusals) {
-        EXPECT_EQ(Edit(each.action, each.arguments), 1) << each.says;
+        EXPECT_EQ(p.Edit(each.action, each.arguments), 1) << each.says;
         EXPECT_NE(p.err.str().find(each.says), std::string::npos) << p.err.str();
         EXPECT_EQ(Slurp(p.path), saved) << each.says;
         EXPECT_FALSE(std::filesystem::exists(EditedDescriptionPath(p.path, u"T"))) << each.says;
     }
     EditRequest request{"U", EditKind::Remove, "AI0", "", ""};
     EXPECT_EQ(RunEdit(Options(), p.path, request, p.out, p.err), 1);
+}
+
+constexpr const char* kBoard = R"(<Target name="Board">
+  <Connector name="C0">
+    <DigitalLine name="DIO0">
+      <MethodSet>
+        <Method name="Read"><Signature>Boolean Read()</Signature></Method>
+      </MethodSet>
+      <AttributeSet>
+        <Attribute name="Direction"><Value>Input</Value></Attribute>
+        <Attribute name="Colour"><Value>Red</Value>
+          <DoesNotAffectCompilation>Yes</DoesNotAffectCompilation></Attribute>
+        <Attribute name="Initial"><Value>Low</Value>
+          <DoesNotAffectCompilation>false</DoesNotAffectCompilation></Attribute>
+      </AttributeSet>
+    </DigitalLine>
+  </Connector>
+</Target>
+)";
+
+// Items driven by edits: each command opens the saved project (the module makes and binds
+// every item), changes the target's tree, saves, and the JSON listing tells what every item
+// now reports. The items' own rules are tested in ItemBindingTest.
+class CliItemLife : public ::testing::Test {
+protected:
+    void SetUp() override {
+        p.description = p.scratch.Write("board.xml", kBoard);
+        ASSERT_EQ(p.New({"T=" + p.description}), kProjectOk) << p.err.str();
+    }
+    void Add(const std::string& resource, const std::string& name) {
+        EXPECT_EQ(p.Add({"T", resource, name}), kProjectOk) << p.err.str();
+    }
+    void Edit(const std::string& action, const std::vector<std::string>& arguments) {
+        EXPECT_EQ(p.Edit(action, arguments), 0) << p.err.str();
+    }
+    // The items of the reopened project by path.
+    std::map<std::string, nlohmann::json> Items() {
+        std::map<std::string, nlohmann::json> items;
+        const auto listing = p.Json();
+        for (const auto& item : listing["targets"][0]["items"])
+            items[item["path"].get<std::string>()] = item;
+        return items;
+    }
+    ScratchProject p;
+};
+
+TEST_F(CliItemLife, EditsReachTheItemsAndTheListingShowsWhatTheyReport) {
+    Add("C0/DIO0", "F/Valve"); // in a folder: the path says so
+    Add("C0/DIO0", "Backup");
+    auto items = Items();
+    EXPECT_EQ(items["F/Valve"]["statusText"], "bound");
+    EXPECT_EQ(items["Backup"]["statusText"], "conflict");
+    // Defaults arrive from the definitions; "Yes" leaves one out of the configuration, "false"
+    // keeps it.
+    const std::string configuration = items["F/Valve"]["compileConfiguration"];
+    EXPECT_NE(configuration.find("Direction=Input;Initial=Low;resource=/C0/DIO0;0"),
+              std::string::npos)
+        << configuration;
+    EXPECT_EQ(configuration.find("Colour"), std::string::npos) << configuration;
+
+    // Each command is a session of its own: what one edit made the items do is what the next
+    // one finds after reopening.
+    Edit("rename", {"C0", "Front"});
+    Edit("set-attribute", {"Front/DIO0/MethodSet/Read", "Signature", "Boolean Read(U8 Port)"});
+    Edit("set-attribute", {"Front/DIO0/MethodSet/Read", "Signature", "BOOLEAN READ(u8 port)"});
+    EXPECT_NE(p.out.str().find("F/Valve: bound, resource \"/Front/DIO0\", feature set 1"),
+              std::string::npos)
+        << p.out.str();
+    Edit("set-attribute", {"Front/DIO0", "HiddenTIO", "TRUE"});
+    Edit("remove-attribute", {"Front/DIO0", "HiddenTIO"});
+    items = Items();
+    EXPECT_EQ(items["F/Valve"]["resource"], "/Front/DIO0");
+    EXPECT_EQ(items["Backup"]["resource"], "/Front/DIO0");
+    EXPECT_EQ(items["Backup"]["status"], 2);
+    EXPECT_EQ(items["F/Valve"]["featureSetVersion"], 1);
+    EXPECT_EQ(items["F/Valve"]["hidden"], true); // the attribute went; the item stays hidden
+    EXPECT_EQ(Items(), items);
 }
 
 } // namespace

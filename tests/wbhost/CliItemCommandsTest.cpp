@@ -4,9 +4,6 @@
 // was. The item's own rules are tested in ItemCommandsTest.
 #include "CliTestSupport.h"
 #include "cli/ItemCommands.h"
-#include "cli/ProjectCommands.h"
-
-#include <nlohmann/json.hpp>
 
 using clitest::Options;
 using clitest::ScratchProject;
@@ -32,19 +29,9 @@ protected:
         p.description = p.scratch.Write("board.xml", kBoard);
         const std::string other =
             p.scratch.Write("other.xml", "<Target><Line name=\"L\"/></Target>");
-        ASSERT_EQ(p.Run([&](std::ostream& out, std::ostream& err) {
-            return RunProjectNew(Options(), p.path, {"T=" + p.description, "U=" + other}, false,
-                                 out, err);
-        }),
-                  0)
-            << p.err.str();
-        for (const std::string name : {"DIO0", "Backup"}) {
-            ASSERT_EQ(p.Run([&](std::ostream& out, std::ostream& err) {
-                return RunAddItem(Options(), p.path, {"T", "C0/DIO0", name}, out, err);
-            }),
-                      0)
-                << p.err.str();
-        }
+        ASSERT_EQ(p.New({"T=" + p.description, "U=" + other}), 0) << p.err.str();
+        for (const std::string name : {"DIO0", "Backup"})
+            ASSERT_EQ(p.Add({"T", "C0/DIO0", name}), 0) << p.err.str();
     }
     // Runs ACTION on ITEM of target T with ARGUMENTS and the session's ANSWERS.
     int Item(const std::string& item, const std::string& action,
@@ -59,16 +46,14 @@ protected:
         });
     }
     nlohmann::json ItemNamed(const std::string& name) {
-        std::ostringstream listing;
-        EXPECT_EQ(RunProjectJson(Options(), p.path, listing, p.err), 0);
-        const auto parsed = nlohmann::json::parse(listing.str());
-        for (const auto& target : parsed["targets"]) {
+        const auto listing = p.Json();
+        for (const auto& target : listing["targets"]) {
             for (const auto& item : target["items"]) {
                 if (item["path"] == name)
                     return item;
             }
         }
-        ADD_FAILURE() << "no item " << name << " in " << listing.str();
+        ADD_FAILURE() << "no item " << name << " in " << listing.dump(2);
         return nlohmann::json::object();
     }
     std::string Out() const { return p.out.str(); }

@@ -10,6 +10,13 @@ using namespace wbhost::cli;
 
 namespace {
 
+int Program(ScratchProject& p, const HostOptions& options, const std::string& file,
+            const std::vector<std::string>& inputs) {
+    return p.Run([&](std::ostream& out, std::ostream& err) {
+        return RunProgram(options, file, inputs, out, err);
+    });
+}
+
 TEST(CliProgramCommand, BareNamesAreFoundAmongTheModulesPrograms) {
     const std::string found = LocateProgram("TIOGenUniqueName.gx", WBT_MODULE_PATH);
     EXPECT_TRUE(std::filesystem::exists(found)) << found;
@@ -22,41 +29,27 @@ TEST(CliProgramCommand, InputsReachTheProgramAndAnswersItsDialogs) {
     ScratchProject p;
     auto options = Options();
     options.record = true;
-    ASSERT_EQ(p.Run([&](std::ostream& out, std::ostream& err) {
-        return RunProgram(options, "TIOGenUniqueName.gx", {"0=text:DIO", "1=list:dio|DIO1"}, out,
-                          err);
-    }),
-              0)
+    ASSERT_EQ(Program(p, options, "TIOGenUniqueName.gx", {"0=text:DIO", "1=list:dio|DIO1"}), 0)
         << p.err.str();
     EXPECT_NE(p.out.str().find("4 = \"DIO2\""), std::string::npos) << p.out.str();
     EXPECT_NE(p.out.str().find("-- program runs"), std::string::npos);
 
     options.answers = {"select-resource:0=0", "select-resource:1=text:AI0"};
-    ASSERT_EQ(p.Run([&](std::ostream& out, std::ostream& err) {
-        return RunProgram(options, "TIOSelectResourceDialog.gx", {"9=text:DIO0"}, out, err);
-    }),
-              0)
-        << p.err.str();
+    ASSERT_EQ(Program(p, options, "TIOSelectResourceDialog.gx", {"9=text:DIO0"}), 0) << p.err.str();
     EXPECT_NE(p.out.str().find("0 = 0"), std::string::npos) << p.out.str();
     EXPECT_NE(p.out.str().find("1 = \"AI0\""), std::string::npos) << p.out.str();
 }
 
 TEST(CliProgramCommand, BadInputsMissingProgramsAndBadAnswersFail) {
     ScratchProject p;
-    const auto run = [&](const HostOptions& options, const std::string& file,
-                         const std::vector<std::string>& inputs) {
-        return p.Run([&](std::ostream& out, std::ostream& err) {
-            return RunProgram(options, file, inputs, out, err);
-        });
-    };
-    EXPECT_EQ(run(Options(), "TIOGenUniqueName.gx", {"0:text:x"}), 1);
+    EXPECT_EQ(Program(p, Options(), "TIOGenUniqueName.gx", {"0:text:x"}), 1);
     EXPECT_NE(p.err.str().find("is not index=value"), std::string::npos);
-    EXPECT_EQ(run(Options(), "NoSuch.gx", {}), 1);
+    EXPECT_EQ(Program(p, Options(), "NoSuch.gx", {}), 1);
     EXPECT_NE(p.err.str().find("0x80070002"), std::string::npos) << p.err.str();
-    EXPECT_EQ(run(Options(), p.scratch.Write("x.gx", "behaviour: fly\n"), {}), 1);
+    EXPECT_EQ(Program(p, Options(), p.scratch.Write("x.gx", "behaviour: fly\n"), {}), 1);
     auto answered = Options();
     answered.answers = {"select-resource:0=text"};
-    EXPECT_EQ(run(answered, "TIOSelectResourceDialog.gx", {}), 1);
+    EXPECT_EQ(Program(p, answered, "TIOSelectResourceDialog.gx", {}), 1);
 }
 
 } // namespace

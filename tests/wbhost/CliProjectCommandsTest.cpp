@@ -1,6 +1,5 @@
 // `wbhost project new|list|add-item` through the build's module.
 #include "CliTestSupport.h"
-#include "cli/ProjectCommands.h"
 
 using clitest::Options;
 using clitest::ScratchProject;
@@ -9,49 +8,31 @@ using namespace wbhost::cli;
 
 namespace {
 
-int New(ScratchProject& p, std::vector<std::string> targets, bool replace = false) {
-    return p.Run([&](std::ostream& out, std::ostream& err) {
-        return RunProjectNew(Options(), p.path, targets, replace, out, err);
-    });
-}
-
-int Add(ScratchProject& p, const AddItemRequest& request) {
-    return p.Run([&](std::ostream& out, std::ostream& err) {
-        return RunAddItem(Options(), p.path, request, out, err);
-    });
-}
-
-int List(ScratchProject& p) {
-    return p.Run([&](std::ostream& out, std::ostream& err) {
-        return RunProjectList(Options(), p.path, out, err);
-    });
-}
-
 TEST(CliProjectCommands, ItemsAddedThroughTheProviderComeBackWithTheirAttributeSets) {
     ScratchProject p;
-    ASSERT_EQ(New(p, {"T=" + p.description}), kProjectOk) << p.err.str();
+    ASSERT_EQ(p.New({"T=" + p.description}), kProjectOk) << p.err.str();
     EXPECT_NE(p.out.str().find("target \"T\""), std::string::npos);
-    ASSERT_EQ(Add(p, {"t", "DIO0", ""}), kProjectOk) << p.err.str();
-    ASSERT_EQ(Add(p, {"T", "AI0", "Inputs/Level"}), kProjectOk) << p.err.str();
+    ASSERT_EQ(p.Add({"t", "DIO0", ""}), kProjectOk) << p.err.str();
+    ASSERT_EQ(p.Add({"T", "AI0", "Inputs/Level"}), kProjectOk) << p.err.str();
 
-    ASSERT_EQ(List(p), kProjectOk) << p.err.str();
+    ASSERT_EQ(p.List(), kProjectOk) << p.err.str();
     const std::string listing = p.out.str();
     for (const char* piece :
          {"project \"p\"", "Tangent I/O item \"DIO0\"", "folder \"Inputs\"",
           "tioAttrBag: resource=/DIO0", "tioAttrBag: resource=/AI0", "tioResourceStatus: bound"})
         EXPECT_NE(listing.find(piece), std::string::npos) << piece << "\n" << listing;
     // The folder is reused, not made twice.
-    ASSERT_EQ(Add(p, {"T", "DIO0", "Inputs/Other"}), kProjectOk) << p.err.str();
-    List(p);
+    ASSERT_EQ(p.Add({"T", "DIO0", "Inputs/Other"}), kProjectOk) << p.err.str();
+    p.List();
     const std::string again = p.out.str();
     EXPECT_EQ(again.find("folder \"Inputs\""), again.rfind("folder \"Inputs\""));
 }
 
 TEST(CliProjectCommands, NewRefusesToReplaceAndToSaveHalfAProject) {
     ScratchProject p;
-    ASSERT_EQ(New(p, {"T=" + p.description}), kProjectOk) << p.err.str();
+    ASSERT_EQ(p.New({"T=" + p.description}), kProjectOk) << p.err.str();
     const std::string saved = Slurp(p.path);
-    EXPECT_EQ(New(p, {}), kProjectFailed);
+    EXPECT_EQ(p.New({}), kProjectFailed);
     EXPECT_NE(p.err.str().find("--force"), std::string::npos);
     // Nothing is written when any target fails, even with --force.
     for (const auto& targets : std::vector<std::vector<std::string>>{
@@ -60,11 +41,11 @@ TEST(CliProjectCommands, NewRefusesToReplaceAndToSaveHalfAProject) {
              {"=" + p.description},
              {"T="},
              {"T"}}) {
-        EXPECT_EQ(New(p, targets, true), kProjectFailed) << targets.back();
+        EXPECT_EQ(p.New(targets, true), kProjectFailed) << targets.back();
         EXPECT_FALSE(p.err.str().empty());
         EXPECT_EQ(Slurp(p.path), saved);
     }
-    EXPECT_EQ(New(p, {"U=" + p.description}, true), kProjectOk) << p.err.str();
+    EXPECT_EQ(p.New({"U=" + p.description}, true), kProjectOk) << p.err.str();
     EXPECT_NE(Slurp(p.path).find(" U\n"), std::string::npos);
 }
 
@@ -72,17 +53,17 @@ TEST(CliProjectCommands, ProjectsFindTheirDescriptionsFromAnyFolder) {
     ScratchProject p;
     const auto before = std::filesystem::current_path();
     std::filesystem::current_path(p.scratch.Path());
-    const int made = New(p, {"T=t.xml"});
+    const int made = p.New({"T=t.xml"});
     std::filesystem::current_path(before);
     ASSERT_EQ(made, kProjectOk) << p.err.str();
-    EXPECT_EQ(List(p), kProjectOk) << p.err.str();
+    EXPECT_EQ(p.List(), kProjectOk) << p.err.str();
     EXPECT_NE(p.out.str().find("from " + p.description), std::string::npos) << p.out.str();
 }
 
 TEST(CliProjectCommands, AddItemRefusalsLeaveTheFileAsItWas) {
     ScratchProject p;
-    ASSERT_EQ(New(p, {"T=" + p.description}), kProjectOk) << p.err.str();
-    ASSERT_EQ(Add(p, {"T", "DIO0", "Box/Valve"}), kProjectOk) << p.err.str();
+    ASSERT_EQ(p.New({"T=" + p.description}), kProjectOk) << p.err.str();
+    ASSERT_EQ(p.Add({"T", "DIO0", "Box/Valve"}), kProjectOk) << p.err.str();
     const std::string saved = Slurp(p.path);
     const struct {
         AddItemRequest request;
@@ -101,24 +82,21 @@ TEST(CliProjectCommands, AddItemRefusalsLeaveTheFileAsItWas) {
         {{"T", "AI0", "New/Valve"}, "already has an I/O item"},
     };
     for (const auto& each : refusals) {
-        EXPECT_EQ(Add(p, each.request), kProjectFailed) << each.says;
+        EXPECT_EQ(p.Add(each.request), kProjectFailed) << each.says;
         EXPECT_NE(p.err.str().find(each.says), std::string::npos) << p.err.str();
         EXPECT_EQ(Slurp(p.path), saved) << each.says;
     }
-    EXPECT_EQ(Add(p, {"T", "AI0", ""}), kProjectOk) << p.err.str();
+    EXPECT_EQ(p.Add({"T", "AI0", ""}), kProjectOk) << p.err.str();
 }
 
 TEST(CliProjectCommands, AModuleThatCannotBeLoadedOrAProjectThatCannotBeReadFails) {
     ScratchProject p;
     auto options = Options();
     options.modulePath = p.scratch.File("none.qxx");
-    EXPECT_EQ(p.Run([&](std::ostream& out, std::ostream& err) {
-        return RunProjectNew(options, p.path, {}, false, out, err);
-    }),
-              kProjectFailed);
+    EXPECT_EQ(p.New({}, false, options), kProjectFailed);
     EXPECT_FALSE(std::filesystem::exists(p.path));
     p.scratch.Write("p.wbproj", "wbhost-project 1\nitem\n");
-    EXPECT_EQ(List(p), kProjectFailed);
+    EXPECT_EQ(p.List(), kProjectFailed);
     EXPECT_NE(p.err.str().find("line 2"), std::string::npos) << p.err.str();
 }
 

@@ -1,7 +1,6 @@
 // Real wbhost processes changing one project at once: every change reported as done is in the
 // file afterwards; one refused says why and changes nothing.
 #include "CliTestSupport.h"
-#include "cli/ProjectCommands.h"
 
 #include <fcntl.h>
 #include <filesystem>
@@ -11,7 +10,6 @@
 #include <unistd.h>
 #include <vector>
 
-using clitest::Options;
 using clitest::ScratchProject;
 using clitest::Slurp;
 
@@ -49,12 +47,7 @@ std::vector<std::string> AddItem(const ScratchProject& p, const std::string& nam
 }
 
 void CreateProject(ScratchProject& p) {
-    ASSERT_EQ(p.Run([&](std::ostream& out, std::ostream& err) {
-        return wbhost::cli::RunProjectNew(Options(), p.path, {"T=" + p.description}, false, out,
-                                          err);
-    }),
-              wbhost::cli::kProjectOk)
-        << p.err.str();
+    ASSERT_EQ(p.New({"T=" + p.description}), wbhost::cli::kProjectOk) << p.err.str();
 }
 
 TEST(CliSharedProject, EveryAddReportedAsDoneIsInTheFile) {

@@ -3,10 +3,13 @@
 #pragma once
 
 #include "ProjectTestSupport.h"
+#include "cli/EditCommands.h"
 #include "cli/HostOptions.h"
+#include "cli/ProjectCommands.h"
 #include "project/AtomicFile.h"
 
 #include <gtest/gtest.h>
+#include <nlohmann/json.hpp>
 #include <sstream>
 #include <string>
 
@@ -37,6 +40,45 @@ struct ScratchProject {
         out.str("");
         err.str("");
         return work(out, err);
+    }
+    // The project commands on this project, as `wbhost project ...` runs them.
+    int New(const std::vector<std::string>& targets, bool replace = false,
+            const wbhost::cli::HostOptions& options = Options()) {
+        return Run([&](std::ostream& o, std::ostream& e) {
+            return wbhost::cli::RunProjectNew(options, path, targets, replace, o, e);
+        });
+    }
+    int Add(const wbhost::cli::AddItemRequest& request,
+            const wbhost::cli::HostOptions& options = Options()) {
+        return Run([&](std::ostream& o, std::ostream& e) {
+            return wbhost::cli::RunAddItem(options, path, request, o, e);
+        });
+    }
+    int List() {
+        return Run([&](std::ostream& o, std::ostream& e) {
+            return wbhost::cli::RunProjectList(Options(), path, o, e);
+        });
+    }
+    // `wbhost edit` on target T: ACTION with ARGUMENTS; -1 when they do not parse.
+    int Edit(const std::string& action, const std::vector<std::string>& arguments) {
+        wbhost::cli::EditRequest request{"T", wbhost::cli::EditKind::Rename, "", "", ""};
+        std::string error;
+        if (!wbhost::cli::ParseEdit(action, arguments, request, error)) {
+            err << error;
+            return -1;
+        }
+        return Run([&](std::ostream& o, std::ostream& e) {
+            return wbhost::cli::RunEdit(Options(), path, request, o, e);
+        });
+    }
+    // The JSON listing of the reopened project; an empty object when it cannot be made.
+    nlohmann::json Json() {
+        const int exit = Run([&](std::ostream& o, std::ostream& e) {
+            return wbhost::cli::RunProjectJson(Options(), path, o, e);
+        });
+        EXPECT_EQ(exit, wbhost::cli::kProjectOk) << err.str();
+        return exit == wbhost::cli::kProjectOk ? nlohmann::json::parse(out.str())
+                                               : nlohmann::json::object();
     }
 };
 
