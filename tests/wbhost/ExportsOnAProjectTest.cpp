@@ -1,19 +1,21 @@
 // The module's tree and item exports called as a host program calls them: through dlopen, with
 // refnums, host strings and host arrays, on a real target's tree and real items of a project.
-#include "HostArrays.h"
 #include "ProjectTestSupport.h"
+#include "cli/HostStringList.h"
 #include "cli/HostText.h"
 #include "cli/HostedModule.h"
 #include "framework/IqxProvider.h"
 #include "runtime/FailureInjection.h"
 #include "runtime/RefnumTable.h"
+#include "runtime/Runtime.h"
 
+#include <cstring>
 #include <gtest/gtest.h>
 
 using namespace projecttest;
-using hostarrays::HostArray;
 using qv::com::ComPtr;
 using wbhost::cli::HostStringBytes;
+using wbhost::cli::HostStringList;
 using wbhost::cli::NewHostString;
 using wbhost::runtime::FailingCall;
 using wbhost::runtime::FailNthCall;
@@ -37,6 +39,44 @@ constexpr const char* kBoard = R"(<Target>
   </Connector>
 </Target>
 )";
+
+// The texts of the host string array HANDLE as they are now (a null element reads as "<null>").
+inline std::vector<std::string> Texts(WBHandle handle) {
+    std::vector<std::string> texts;
+    if (handle == nullptr)
+        return texts;
+    const auto* data = static_cast<const unsigned char*>(*handle);
+    int32_t count = 0;
+    std::memcpy(&count, data, sizeof count);
+    for (int32_t i = 0; i < count; ++i) {
+        WBHandle element = nullptr;
+        std::memcpy(&element, data + 8 + 8 * i, sizeof element);
+        texts.push_back(element ? wbhost::cli::HostStringBytes(element) : "<null>");
+    }
+    return texts;
+}
+
+// An array of 32-bit refnums (the count, then the numbers) sized as a host sizes it, given back
+// when it goes.
+class RefnumArray {
+public:
+    explicit RefnumArray(const std::vector<WBRefNum>& refnums) {
+        EXPECT_EQ(NumericArrayResize(kWBTypeU32, 1, &handle_, refnums.size()), kWBNoErr);
+        const auto count = static_cast<int32_t>(refnums.size());
+        auto* data = static_cast<unsigned char*>(*handle_);
+        std::memcpy(data, &count, sizeof count);
+        if (!refnums.empty())
+            std::memcpy(data + 4, refnums.data(), refnums.size() * sizeof(WBRefNum));
+    }
+    ~RefnumArray() { DSDisposeHandle(handle_); }
+    RefnumArray(const RefnumArray&) = delete;
+    RefnumArray& operator=(const RefnumArray&) = delete;
+    // The handle, by reference as host arrays are passed.
+    WBHandle* Ref() { return &handle_; }
+
+private:
+    WBHandle handle_ = nullptr;
+};
 
 std::string Cluster(std::string_view name, std::string_view value) {
     return "<Cluster><Name></Name><NumElts>2</NumElts><String><Name>name</Name><Val>" +
@@ -100,19 +140,21 @@ TEST_F(ExportsOnAProject, QueriesAnswerReservationsAndProtocolsAndLeaveOutputsAl
 
     // The caller's array is resized to the protocols, in the node's order; one that held more
     // elements gives the extra ones back.
-    HostArray list;
-    HostArray::Strings(list, {"a", "b", "c"});
+    HostStringList list({"a", "b", "c"});
     uint8_t found = 7;
-    ASSERT_EQ(protocols(&tree, NewHostString("C0/DIO0").get(), list.Ref(), &found), S_OK);
+    ASSERT_EQ(protocols(&tree, NewHostString("C0/DIO0").get(), &list.Handle(), &found), S_OK);
     EXPECT_EQ(found, 1);
-    EXPECT_EQ(list.Texts(), (std::vector<std::string>{"IOResource", "Digital"}));
-    // A null handle is allocated for the caller; a path off the tree leaves the array alone.
-    HostArray fresh;
-    ASSERT_EQ(protocols(&tree, NewHostString("C0/DIO1").get(), fresh.Ref(), &found), S_OK);
-    EXPECT_EQ(fresh.Texts(), std::vector<std::string>{"IOResource"});
-    EXPECT_EQ(protocols(&tree, NewHostString("C0/DIO2/X").get(), list.Ref(), &found), S_OK);
+    EXPECT_EQ(Texts(list.Handle()), (std::vector<std::string>{"IOResource", "Digital"}));
+    // A null handle (the list's own block given back first) is allocated for the caller; a path
+    // off the tree leaves the array alone.
+    HostStringList fresh({});
+    DSDisposeHandle(fresh.Handle());
+    fresh.Handle() = nullptr;
+    ASSERT_EQ(protocols(&tree, NewHostString("C0/DIO1").get(), &fresh.Handle(), &found), S_OK);
+    EXPECT_EQ(Texts(fresh.Handle()), std::vector<std::string>{"IOResource"});
+    EXPECT_EQ(protocols(&tree, NewHostString("C0/DIO2/X").get(), &list.Handle(), &found), S_OK);
     EXPECT_EQ(found, 0);
-    EXPECT_EQ(list.Texts(), (std::vector<std::string>{"IOResource", "Digital"}));
+    EXPECT_EQ(Texts(list.Handle()), (std::vector<std::string>{"IOResource", "Digital"}));
 
     // A refnum of something that is no tree: its status, outputs as cleared.
     uint32_t reserved = 7;
@@ -185,39 +227,32 @@ TEST_F(ExportsOnAProject, AttributesReachOneItemOrOneTextEachOfSeveral) {
     const WBRefNum b = AddItem(u"B", u"/C0/DIO1");
 
     // A new resource through the attributes: the item binds to it.
-    HostArray texts;
-    HostArray::Strings(texts, {Cluster("resource", "/C0/DIO2"), Cluster("Colour", "red")});
-    ASSERT_EQ(setAttributes(&a, texts.Ref()), S_OK);
+    HostStringList texts({Cluster("resource", "/C0/DIO2"), Cluster("Colour", "red")});
+    ASSERT_EQ(setAttributes(&a, &texts.Handle()), S_OK);
     EXPECT_EQ(Resource(0), u"/C0/DIO2");
     EXPECT_EQ(Tree().QueryReservation(*Tree().Find(u"/C0/DIO2"), items_[0]), S_OK);
     // A text that does not parse is reported, and what came before it is applied and bound.
-    HostArray bad;
-    HostArray::Strings(bad, {Cluster("resource", "/C0/DIO0"), "<Cluster>", Cluster("x", "y")});
-    EXPECT_TRUE(FAILED(setAttributes(&a, bad.Ref())));
+    HostStringList bad({Cluster("resource", "/C0/DIO0"), "<Cluster>", Cluster("x", "y")});
+    EXPECT_TRUE(FAILED(setAttributes(&a, &bad.Handle())));
     EXPECT_EQ(Resource(0), u"/C0/DIO0");
     EXPECT_EQ(Tree().QueryReservation(*Tree().Find(u"/C0/DIO0"), items_[0]), S_OK);
 
     // Text i to item i. Fewer refnums than texts is refused before any item changes: the
     // caller's count is the end of its block.
-    HostArray both;
-    HostArray::Refnums(both, {a, b});
-    HostArray one;
-    HostArray::Refnums(one, {b});
-    HostArray two;
-    HostArray::Strings(two, {Cluster("resource", "/C0/DIO1"), Cluster("resource", "/C0/DIO2")});
-    EXPECT_EQ(setOnMultiple(one.Ref(), two.Ref()), E_INVALIDARG);
+    RefnumArray both({a, b});
+    RefnumArray one({b});
+    HostStringList two({Cluster("resource", "/C0/DIO1"), Cluster("resource", "/C0/DIO2")});
+    EXPECT_EQ(setOnMultiple(one.Ref(), &two.Handle()), E_INVALIDARG);
     EXPECT_EQ(Resource(1), u"/C0/DIO1");
-    ASSERT_EQ(setOnMultiple(both.Ref(), two.Ref()), S_OK);
+    ASSERT_EQ(setOnMultiple(both.Ref(), &two.Handle()), S_OK);
     EXPECT_EQ(Resource(0), u"/C0/DIO1");
     EXPECT_EQ(Resource(1), u"/C0/DIO2");
     // No texts touch no refnum at all, not even a missing array of them.
-    HostArray none;
-    HostArray::Strings(none, {});
-    EXPECT_EQ(setOnMultiple(nullptr, none.Ref()), S_OK);
+    HostStringList none({});
+    EXPECT_EQ(setOnMultiple(nullptr, &none.Handle()), S_OK);
     // A refnum that is no item stops the walk with its status; the items before it stay changed.
-    HostArray withTree;
-    HostArray::Refnums(withTree, {a, tree});
-    EXPECT_EQ(setOnMultiple(withTree.Ref(), two.Ref()), E_NOINTERFACE);
+    RefnumArray withTree({a, tree});
+    EXPECT_EQ(setOnMultiple(withTree.Ref(), &two.Handle()), E_NOINTERFACE);
     EXPECT_EQ(Resource(0), u"/C0/DIO1");
 }
 
@@ -280,15 +315,14 @@ TEST_F(ExportsOnAProject, AHostErrorWhileWritingComesBackMappedWithTheOutputUnch
     const auto line = NewHostString("C0/DIO0");
     for (const auto& m : mappings) {
         const auto text = NewHostString("old");
-        HostArray list;
-        HostArray::Strings(list, {"x", "y"});
+        HostStringList list({"x", "y"});
         uint8_t found = 0;
         FailNthCall(FailingCall::NumericArrayResize, 1, m.error);
         EXPECT_EQ(dump(&tree, connector.get(), text.get(), &found), m.status);
         EXPECT_EQ(HostStringBytes(text.get()), "old");
         FailNthCall(FailingCall::NumericArrayResize, 1, m.error);
-        EXPECT_EQ(protocols(&tree, line.get(), list.Ref(), &found), m.status);
-        EXPECT_EQ(list.Texts(), (std::vector<std::string>{"x", "y"}));
+        EXPECT_EQ(protocols(&tree, line.get(), &list.Handle(), &found), m.status);
+        EXPECT_EQ(Texts(list.Handle()), (std::vector<std::string>{"x", "y"}));
         // The texts are emptied before anything else: that first write fails, the status stays 3.
         int32_t status = -1;
         const auto shown = NewHostString("old");
