@@ -38,6 +38,11 @@ struct BlockList {
         FreeBlock* block = head;
         head = block->next;
         --count;
+        // Blocks freed by a tree's teardown come back in the order of its nodes, not of their
+        // addresses, so reading the next link would miss the cache on nearly every allocation of
+        // the next load. Fetching it now lets the element's parsing hide the wait.
+        if (head != nullptr)
+            __builtin_prefetch(head, 1);
         return block;
     }
     // Moves every block of FROM to the front of this list.
