@@ -143,9 +143,14 @@ ParseStack::Frame* ParseStack::ProcessNode(Frame& frame, bool container, const s
             AddError(node, u"Unable to find prototype node: " + *steering.prototype);
     }
     const bool hadPrototype = prototype != nullptr;
-    MergeOrReplace(node, name, tagName, ordered, overwrite, &prototype);
+    const ResTreePosition place =
+        MergeOrReplace(node, name, tagName, ordered, overwrite, &prototype);
     CountEntry(name.size() + tagName.size());
-    const auto made = node.AddChild(InsertPosition(node, steering), name, tagName, ordered);
+    // A sorted node inserts where MergeOrReplace looked, without a second lookup; a "next"
+    // attribute is still looked up (which may load deferred content) as in an ordered node.
+    const auto made = node.IsOrdered() || steering.next != nullptr
+                          ? node.AddChild(InsertPosition(node, steering), name, tagName, ordered)
+                          : node.AddChildAt(place, name, tagName, ordered);
     if (hadPrototype && prototype == nullptr)
         AddError(node, u"Unable to find prototype node: " + *steering.prototype);
     if (prototype != nullptr &&

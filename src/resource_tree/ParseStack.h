@@ -102,9 +102,11 @@ private:
     ResTreePosition InsertPosition(ResTreeNode& node, const Steering& steering);
     std::u16string RewriteReferenceList(ResTreeNode& node, const std::u16string& text) const;
 
-    // Copies and variables (TreeCopy.cpp).
-    void MergeOrReplace(ResTreeNode& node, const std::u16string& name, const std::u16string& type,
-                        bool ordered, bool overwrite, ResTreeNode** guarded);
+    // Copies and variables (TreeCopy.cpp). MergeOrReplace answers where in NODE the name now
+    // stands or would go (End() when it removed the entry), for AddChildAt.
+    ResTreePosition MergeOrReplace(ResTreeNode& node, const std::u16string& name,
+                                   const std::u16string& type, bool ordered, bool overwrite,
+                                   ResTreeNode** guarded);
     void CopyEntries(ResTreeNode& source, ResTreeNode& destination, bool overwrite, int depth);
     void MakeNameCopies(Frame& frame);
     void SubstituteInSubtree(ResTreeNode& node, const VariableMap& variables, int depth);

@@ -110,6 +110,15 @@ ResTreeNode::Position ResTreeNode::Find(std::u16string_view name) const noexcept
     return End();
 }
 
+ResTreeNode::Place ResTreeNode::Locate(std::u16string_view name) const noexcept {
+    if (ordered_) {
+        const Position found = Find(name);
+        return {found, found != End()};
+    }
+    const auto at = set_.lower_bound(name);
+    return {Position(at), at != set_.end() && !EntryNameLess()(name, *at)};
+}
+
 ResTreeNode::Position ResTreeNode::FindLoading(std::u16string_view name) {
     Position found = Find(name);
     if (found != End())
@@ -144,7 +153,7 @@ const WString* ResTreeNode::TextAt(std::u16string_view name) {
 }
 
 ResTreeNode::Position ResTreeNode::InsertEntry(Position position, WString&& name, EntryKind kind,
-                                               bool& inserted) {
+                                               bool& inserted, bool hinted) {
     mayDefer_ = mayDefer_ || MayNameDeferredContent(name);
     if (ordered_) {
         inserted = true;
@@ -153,6 +162,15 @@ ResTreeNode::Position ResTreeNode::InsertEntry(Position position, WString&& name
         if (index_)
             IndexInserted(made, before == list_.end());
         return Position(made);
+    }
+    if (hinted) {
+        // From a place the caller has just looked up, the set checks the neighbours and inserts
+        // there; only a wrong place costs a descent. (A position of the list is no place here.)
+        const size_t before = set_.size();
+        const auto at = set_.emplace_hint(position.ordered_ ? set_.end() : position.set_,
+                                          std::move(name), kind);
+        inserted = set_.size() != before;
+        return Position(at);
     }
     // One descent of the tree both finds the place and tells whether the name is taken; a lookup
     // first and an insertion at its hint would compare the name a few more times (and names
@@ -179,9 +197,19 @@ ResTreeNode::AddResult ResTreeNode::AddLink(Position position, WString name, WSt
 
 ResTreeNode::AddChildResult ResTreeNode::AddChild(Position position, WString name, WString type,
                                                   bool ordered) {
+    return MakeChild(position, std::move(name), std::move(type), ordered, false);
+}
+
+ResTreeNode::AddChildResult ResTreeNode::AddChildAt(Position position, WString name, WString type,
+                                                    bool ordered) {
+    return MakeChild(position, std::move(name), std::move(type), ordered, true);
+}
+
+ResTreeNode::AddChildResult ResTreeNode::MakeChild(Position position, WString&& name,
+                                                   WString&& type, bool ordered, bool hinted) {
     bool inserted = false;
     WString childName = name;
-    const Position at = InsertEntry(position, std::move(name), EntryKind::Child, inserted);
+    const Position at = InsertEntry(position, std::move(name), EntryKind::Child, inserted, hinted);
     if (!inserted)
         return {at, at->child_.get(), false};
     at->child_ =

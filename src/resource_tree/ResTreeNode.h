@@ -149,6 +149,15 @@ public:
     Position End() const noexcept;
     // The (first) entry named NAME, ignoring case, without loading deferred content; End() if none.
     Position Find(std::u16string_view name) const noexcept;
+    // Where NAME stands without loading deferred content: FOUND and the (first) entry of that name,
+    // or not FOUND and, in a sorted node, the entry NAME would go before (End() when it would go
+    // last; End() in an ordered node). One lookup then serves both the check for an existing entry
+    // and the insertion that follows it (AddChildAt).
+    struct Place {
+        Position position;
+        bool found;
+    };
+    Place Locate(std::u16string_view name) const noexcept;
     // Find; on a miss, loads the deferred content and looks again.
     Position FindLoading(std::u16string_view name);
     // The node an entry stands for: the child, or a link's target; null for End and other kinds.
@@ -169,6 +178,11 @@ public:
     // Inserts a new child node, or (unordered) answers the existing entry of that name as is.
     // Raises ChildAdded when created.
     AddChildResult AddChild(Position position, WString name, WString type, bool ordered);
+    // AddChild, where a sorted node starts from POSITION (End() or an entry of this node) instead
+    // of its root: with what Locate(NAME) answered, and no entry removed since, the insertion costs
+    // two comparisons of names, not a second descent; another place only costs the descent. An
+    // ordered node inserts before POSITION, as AddChild does.
+    AddChildResult AddChildAt(Position position, WString name, WString type, bool ordered);
     // Replaces the string of a text entry; false (and no change) for End and other kinds.
     bool SetTextAt(Position position, WString text);
     // Appends TEXT to the string of a text entry; false (and no change) for End and other kinds.
@@ -269,7 +283,12 @@ private:
     void Unwatch(ResTreeNode& other);
     void StopWatchingAll() noexcept;
     bool IsWatching(const ResTreeNode& other) const noexcept;
-    Position InsertEntry(Position position, WString&& name, EntryKind kind, bool& inserted);
+    // Inserts a new entry (an unordered node keeps an existing one of that name and answers it);
+    // a sorted node looks for the place from POSITION when HINTED, else from its root.
+    Position InsertEntry(Position position, WString&& name, EntryKind kind, bool& inserted,
+                         bool hinted = false);
+    AddChildResult MakeChild(Position position, WString&& name, WString&& type, bool ordered,
+                             bool hinted);
     void EraseEntry(Position position) noexcept;
     // Raises the changes of a new value in the text entry ENTRY of this node.
     void RaiseValueChanged(const ResTreeEntry& entry);

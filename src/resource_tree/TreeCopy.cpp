@@ -4,22 +4,26 @@
 
 namespace wbhw {
 
-void ParseStack::MergeOrReplace(ResTreeNode& node, const std::u16string& name,
-                                const std::u16string& type, bool ordered, bool overwrite,
-                                ResTreeNode** guarded) {
-    const ResTreePosition found = node.Find(name);
-    if (found == node.End())
-        return;
+ResTreePosition ParseStack::MergeOrReplace(ResTreeNode& node, const std::u16string& name,
+                                           const std::u16string& type, bool ordered, bool overwrite,
+                                           ResTreeNode** guarded) {
+    const ResTreeNode::Place place = node.Locate(name);
+    if (!place.found)
+        return place.position;
+    const ResTreePosition found = place.position;
     ResTreeNode* child = found->Child();
     if (overwrite && child != nullptr && qv::kern::EqualsNoCase(child->Type(), type) &&
         child->IsOrdered() == ordered)
-        return;
+        return found;
     // A prototype inside the entry about to go would be read after it was deleted.
     if (guarded != nullptr && *guarded != nullptr && child != nullptr &&
         IsAncestorOrSelf(child, *guarded))
         *guarded = nullptr;
-    if (!node.RemoveAt(found))
+    if (!node.RemoveAt(found)) {
         AddError(node, u"Unable to replace a node that is still being loaded: " + name);
+        return found;
+    }
+    return node.End();
 }
 
 void ParseStack::CopyEntries(ResTreeNode& source, ResTreeNode& destination, bool overwrite,
@@ -38,11 +42,12 @@ void ParseStack::CopyEntries(ResTreeNode& source, ResTreeNode& destination, bool
                 destination.SetTextAt(added.position, *at->Text());
         } else if (kind == EntryKind::Child && at->Child() != nullptr) {
             ResTreeNode& from = *at->Child();
-            MergeOrReplace(destination, at->Name(), from.Type(), from.IsOrdered(), overwrite,
-                           nullptr);
+            const ResTreePosition place = MergeOrReplace(destination, at->Name(), from.Type(),
+                                                         from.IsOrdered(), overwrite, nullptr);
             CountEntry(at->Name().size() + from.Type().size());
             const auto made =
-                destination.AddChild(destination.End(), at->Name(), from.Type(), from.IsOrdered());
+                destination.AddChildAt(destination.IsOrdered() ? destination.End() : place,
+                                       at->Name(), from.Type(), from.IsOrdered());
             if (made.node != nullptr && !IsAncestorOrSelf(&from, made.node) &&
                 !IsAncestorOrSelf(made.node, &from))
                 CopyEntries(from, *made.node, overwrite, depth + 1);
@@ -71,15 +76,14 @@ void ParseStack::MakeNameCopies(Frame& frame) {
     ResTreePosition previous = frame.templatePosition;
     for (size_t i = 1; i < names.size(); ++i) {
         const ExpandedName& copy = names[i];
-        MergeOrReplace(node, copy.name, model->Type(), model->IsOrdered(), frame.namesOverwrite,
-                       nullptr);
-        ResTreePosition at = node.End();
+        ResTreePosition at = MergeOrReplace(node, copy.name, model->Type(), model->IsOrdered(),
+                                            frame.namesOverwrite, nullptr);
         if (node.IsOrdered()) {
             at = previous;
             ++at;
         }
         CountEntry(copy.name.size() + model->Type().size());
-        const auto made = node.AddChild(at, copy.name, model->Type(), model->IsOrdered());
+        const auto made = node.AddChildAt(at, copy.name, model->Type(), model->IsOrdered());
         if (made.node == nullptr || IsAncestorOrSelf(model, made.node)) {
             AddError(node, u"Unable to copy the node for the name: " + copy.name);
             continue;
