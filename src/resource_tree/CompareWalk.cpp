@@ -342,13 +342,12 @@ uint32_t CompareWalk::Texts(const ResTreeNode& a, const ResTreeEntry& e, const R
         }
         return kMatch;
     }
-    if ((nameClass & kListName) == 0) {
-        // Identical texts split alike and cover each other piece for piece.
-        if (ta == tb)
-            return kMatch;
-        if (!EqualsNoCase(ta, tb))
-            return Short(CompareReason::TextDiffers, a, e, &f);
-    }
+    // Identical texts split alike and cover each other piece for piece, lists included (a list
+    // of the same pieces has the same length, and a piece always equals itself).
+    if (ta == tb)
+        return kMatch;
+    if ((nameClass & kListName) == 0 && !EqualsNoCase(ta, tb))
+        return Short(CompareReason::TextDiffers, a, e, &f);
     return Lists(a, e, f, tally);
 }
 
