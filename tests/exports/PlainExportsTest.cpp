@@ -1,4 +1,5 @@
-// TIO_CompareTwoResourceTrees, called through the loaded module with host-style C texts.
+// The exports that take plain C values (GetInfo, TIO_CompareTwoResourceTrees), called through the
+// loaded module as a host calls them.
 #include "LoadedModule.h"
 
 #include <cstdint>
@@ -9,7 +10,16 @@ namespace {
 
 using CompareFn = uint32_t(const char*, const char*);
 
-TEST(CompareExport, AnswersTheThreeCodesAndTakesNullAsEmpty) {
+TEST(InfoExport, AnswersFiveEveryTime) {
+    test::LoadedModule module;
+    ASSERT_TRUE(module.Loaded()) << test::LoadedModule::LoadError();
+    auto* getInfo = module.Find<int32_t()>("GetInfo");
+    ASSERT_NE(getInfo, nullptr);
+    EXPECT_EQ(getInfo(), 5);
+    EXPECT_EQ(getInfo(), 5);
+}
+
+TEST(CompareExport, AnswersTheThreeCodesTakesNullAsEmptyAndReadsTheDefaultCodePage) {
     test::LoadedModule module;
     ASSERT_TRUE(module.Loaded()) << test::LoadedModule::LoadError();
     auto* compare = module.Find<CompareFn>("TIO_CompareTwoResourceTrees");
@@ -24,13 +34,7 @@ TEST(CompareExport, AnswersTheThreeCodesAndTakesNullAsEmpty) {
     EXPECT_EQ(compare(required.c_str(), required.c_str()), 0u);
     EXPECT_EQ(compare(required.c_str(), offered.c_str()), 2u);
     EXPECT_EQ(compare(offered.c_str(), required.c_str()), 1u);
-}
 
-TEST(CompareExport, MultibyteTextsAreReadInTheDefaultCodePage) {
-    test::LoadedModule module;
-    ASSERT_TRUE(module.Loaded()) << test::LoadedModule::LoadError();
-    auto* compare = module.Find<CompareFn>("TIO_CompareTwoResourceTrees");
-    ASSERT_NE(compare, nullptr);
     // "\xE9" is e-acute in the default single-byte code page; as UTF-8 bytes it would be invalid.
     const std::string lower = "<IOResource><Name>caf\xE9</Name></IOResource>";
     const std::string upper = "<IOResource><Name>CAF\xC9</Name></IOResource>";
