@@ -22,6 +22,7 @@ TEST(CliAnswers, RefusesMisspeltBehavioursAndMalformedTextsWithoutSettingAnythin
     EXPECT_EQ(error, "answer \"select-resorce:0=1\": no program behaviour has that name");
     // Terminals run from 0 to 15: an answer for output 200 would be printed and never read.
     for (const char* bad : {"select-resource", "select-resource:0", ":0=1", "select-resource:x=1",
+                            "select-resource:=1", "select-resource:1=2x", "select-resource=1:2",
                             "select-resource:0=maybe", "select-resource:0=", "select-resource:16=1",
                             "select-resource:200=1", "select-resource:0=text:\xFF\xFE",
                             "select-resource:0=list:a|b\xC3"}) {
@@ -31,6 +32,9 @@ TEST(CliAnswers, RefusesMisspeltBehavioursAndMalformedTextsWithoutSettingAnythin
     }
     EXPECT_TRUE(session.AnswersFor("select-resource").empty());
 
+    // Only the first "=" ends the index: a text may hold more of them, and colons.
+    ASSERT_TRUE(AddAnswer("new-item-wizard:2=text:a=b:c", session, error)) << error;
+    EXPECT_EQ(session.AnswersFor("new-item-wizard").at(2), ProgramValue(std::u16string(u"a=b:c")));
     ASSERT_TRUE(AddAnswer("new-item-wizard:3=list:a|b", session, error)) << error;
     EXPECT_EQ(session.AnswersFor("new-item-wizard").at(3),
               ProgramValue(std::vector<std::u16string>{u"a", u"b"}));

@@ -1,10 +1,12 @@
-// The program runner as the module reaches it: root object, runner service, runner, programs.
+// The program runner as the module reaches it: root object, runner service, runner, programs;
+// and unique names as the unique-name program makes them.
 #include "TestObjects.h"
 #include "com/Bstr.h"
 #include "com/TaskMem.h"
 #include "runner/HostProgram.h"
 #include "runner/ProgramFile.h"
 #include "runner/RunnerService.h"
+#include "runner/UniqueName.h"
 #include "runtime/Runtime.h"
 
 #include <filesystem>
@@ -133,16 +135,6 @@ TEST_F(RunnerProgram, DialogsAnswerFromTheSessionElseAsIfClosed) {
     EXPECT_EQ(session->Runs().size(), 8u);
 }
 
-TEST_F(RunnerProgram, AnswerTextsOfTheWrongFormSetNothing) {
-    for (const char* text : {"", "wizard", "wizard:=1", "wizard:x=1", "wizard:1=", "wizard:1=2x",
-                             ":1=1", "wizard=1:2"}) {
-        EXPECT_FALSE(session->SetAnswerFromText(text)) << text;
-    }
-    EXPECT_TRUE(session->AnswersFor("wizard").empty());
-    EXPECT_TRUE(session->SetAnswerFromText("wizard:2=text:a=b:c"));
-    EXPECT_EQ(session->AnswersFor("wizard").at(2), ProgramValue(std::u16string(u"a=b:c")));
-}
-
 TEST(RunnerProgramFile, KeysAreTrimmedAndCommentsSkipped) {
     const auto file = ParseProgramFile("\xEF\xBB\xBF# made elsewhere\r\n"
                                        "  behaviour :  unique-name \r\n\r\ntitle: a: b\n");
@@ -223,6 +215,21 @@ TEST_F(RunnerProgram, HostReferencesItemsAndIcons) {
     EXPECT_EQ(Service()->CreateInstance(IwbProgram::iid, IwbProgramRunner::iid, &other),
               E_NOINTERFACE);
     EXPECT_EQ(other, nullptr);
+}
+
+TEST(RunnerUniqueName, AFreeNameIsKeptElseTheSmallestFreeNumberFollowsTheStem) {
+    EXPECT_EQ(UniqueName(u"Line", {u"Line1", u"Lines"}), u"Line");
+    EXPECT_EQ(UniqueName(u"Line", {u"LINE", u"line1", u"Line2", u"Line4"}), u"Line3");
+    // Trailing digits are the old number, not part of the stem; a gap below is filled.
+    EXPECT_EQ(UniqueName(u"DIO7", {u"DIO7", u"DIO2"}), u"DIO1");
+    EXPECT_EQ(UniqueName(u"12", {u"12", u"121"}), u"122");
+    EXPECT_EQ(UniqueName(u"", {u"1"}), u"2");
+    std::vector<std::u16string> taken{u"A"};
+    for (int i = 1; i <= 200; ++i) {
+        const std::string number = std::to_string(i);
+        taken.push_back(u"A" + std::u16string(number.begin(), number.end()));
+    }
+    EXPECT_EQ(UniqueName(u"A", taken), u"A201");
 }
 
 } // namespace

@@ -1,7 +1,6 @@
-// What the provider reaches through the session's root object (the program runner, project items
-// by identifier) and what the runtime answers about targets, while a project is open and after.
+// What runners made through the session's root object find of the project's items, and what the
+// runtime answers about targets, while a project is open and after.
 #include "ProjectTestSupport.h"
-#include "host/contracts/IwbProgram.h"
 #include "host/contracts/IwbProgramRunnerService.h"
 #include "kern/Guid.h"
 #include "runtime/RefnumTable.h"
@@ -30,13 +29,6 @@ ComPtr<IwbProgramRunner> RunnerThrough(IUnknown* root) {
     return runner;
 }
 
-std::u16string Shipped(const char* name) {
-    const auto path =
-        std::filesystem::path(WBT_MODULE_PATH).parent_path() / "wbtio" / "private" / name;
-    const std::string text = path.string();
-    return std::u16string(text.begin(), text.end());
-}
-
 // The item that TargetItemFromAppRef answers for REFNUM (null on error), and its error.
 std::pair<ComPtr<IwbProjectItem>, WBErr> TargetOf(WBRefNum refnum) {
     void* item = nullptr;
@@ -55,40 +47,6 @@ struct Refnums {
     }
     std::vector<WBRefNum> made;
 };
-
-TEST(SessionRunner, TheProviderRunsAShippedProgramThroughTheRootObjectWithTheSessionsAnswers) {
-    HostSession session;
-    std::string error;
-    ASSERT_TRUE(session.Open(WBT_MODULE_PATH, &error)) << error;
-    IUnknown* const root = session.RootObject();
-    // One identity however the root is asked, and only the runner class is made.
-    EXPECT_EQ(
-        qv::com::QueryAs<IUnknown>(qv::com::QueryAs<IwbProgramRunnerService>(root).Get()).Get(),
-        root);
-    void* other = reinterpret_cast<void*>(1);
-    EXPECT_EQ(qv::com::QueryAs<IwbProgramRunnerService>(root)->CreateInstance(
-                  IwbProgramRunnerService::iid, IwbProgramRunner::iid, &other),
-              E_NOINTERFACE);
-    EXPECT_EQ(other, nullptr);
-
-    auto runner = RunnerThrough(root);
-    ASSERT_TRUE(runner);
-    // The name control's configuration: the module treats any output 4 but 0 as a failure.
-    ASSERT_TRUE(session.Programs().SetAnswerFromText("name-control-config:4=7"));
-    ComPtr<IwbProgram> program;
-    ASSERT_EQ(
-        runner->OpenProgram(Shipped("TIOIONameControlConfigDialog.gx").c_str(), program.Put()),
-        S_OK);
-    ASSERT_EQ(program->SetInputInt32(0, 12), S_OK);
-    ASSERT_EQ(program->Run(), S_OK);
-    int32_t result = 0;
-    ASSERT_EQ(program->GetOutputInt32(4, &result), S_OK);
-    EXPECT_EQ(result, 7);
-    const auto runs = session.Programs().Runs();
-    ASSERT_EQ(runs.size(), 1u);
-    EXPECT_EQ(runs[0].behaviour, "name-control-config");
-    EXPECT_EQ(runs[0].inputs.at(0), wbhost::runner::ProgramValue(int32_t{12}));
-}
 
 TEST(SessionRunner, RunnersFindItemsOnlyWhileTheirProjectIsOpen) {
     ScratchFolder scratch;
