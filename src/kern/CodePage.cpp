@@ -4,6 +4,7 @@
 #include "kern/exception/Exception.h"
 #include "kern/osdep/OSException.h"
 
+#include <algorithm>
 #include <climits>
 #include <cstdlib>
 #include <memory>
@@ -107,22 +108,36 @@ std::u16string AnsiToWide(std::string_view text, std::string_view codePage) {
     UConverter* const converter = ThreadConverter(codePage);
     if (text.empty())
         return std::u16string();
-    const int32_t length = CheckedLength(text.size());
-    // One byte never gives more than one UTF-16 unit in the code pages we use; the second pass
-    // covers any that does.
-    std::u16string out(text.size(), u'\0');
-    UErrorCode status = U_ZERO_ERROR;
-    int32_t units = ucnv_toUChars(converter, out.data(), CheckedLength(out.size()), text.data(),
-                                  length, &status);
-    if (status == U_BUFFER_OVERFLOW_ERROR) {
-        out.assign(static_cast<size_t>(units), u'\0');
-        status = U_ZERO_ERROR;
-        units = ucnv_toUChars(converter, out.data(), units, text.data(), length, &status);
+    CheckedLength(text.size());
+    // Whole descriptions come through here. The output grows a block at a time, so that the zero
+    // fill of each block and ICU's writing meet the same cache lines, instead of a pass of zeros
+    // over a buffer of the whole text first. One byte gives at most one UTF-16 unit in the code
+    // pages we use, so room for the bytes left is room enough; a page that gives more only takes
+    // another round.
+    constexpr size_t kBlock = 16384;
+    ucnv_resetToUnicode(converter);
+    std::u16string out;
+    out.reserve(text.size());
+    const char* source = text.data();
+    const char* const sourceEnd = source + text.size();
+    for (;;) {
+        const size_t used = out.size();
+        const size_t left = static_cast<size_t>(sourceEnd - source);
+        const size_t room = std::max<size_t>(std::min(kBlock, left), 2);
+        out.resize(used + room);
+        UChar* target = out.data() + used;
+        UErrorCode status = U_ZERO_ERROR;
+        ucnv_toUnicode(converter, &target, target + room, &source, sourceEnd, nullptr, true,
+                       &status);
+        out.resize(static_cast<size_t>(target - out.data()));
+        if (status == U_BUFFER_OVERFLOW_ERROR)
+            continue;
+        if (U_FAILURE(status)) {
+            ucnv_resetToUnicode(converter);
+            RaiseConversionFailure(status);
+        }
+        return out; // with the flush, ICU stops early only when the room runs out
     }
-    if (U_FAILURE(status))
-        RaiseConversionFailure(status);
-    out.resize(static_cast<size_t>(units));
-    return out;
 }
 
 std::string WideToAnsi(std::u16string_view text, std::string_view codePage) {

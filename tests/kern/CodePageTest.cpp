@@ -45,6 +45,19 @@ TEST(CodePage, NamedPagesAndUnknownNames) {
     EXPECT_THROW(AnsiToWide("", "latin1"), InvalidLocale);
 }
 
+TEST(CodePage, TextsLongerThanADecodingBlockComeWhole) {
+    // Whole descriptions are decoded a block at a time; double-byte characters and a trailing
+    // bad byte must come out the same across the blocks' edges.
+    std::string bytes = "A";
+    std::u16string wide = u"A";
+    for (int i = 0; i < 20000; ++i) {
+        bytes += "\x93\xFA";
+        wide += u"\u65E5";
+    }
+    EXPECT_EQ(AnsiToWide(bytes, "cp932"), wide);
+    EXPECT_EQ(AnsiToWide(std::string(40000, 'x') + "\x93", "cp932").size(), 40001u);
+}
+
 TEST(CodePage, CharactersThePageLacksBecomeQuestionMarks) {
     unsetenv("WBTANGIO_CODEPAGE");
     EXPECT_EQ(WideToAnsi(u"a\u65E5b"), "a?b");
