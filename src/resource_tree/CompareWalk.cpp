@@ -59,6 +59,12 @@ bool SameSlot(const ResTreeEntry& e, const ResTreeEntry& f) {
     return IsLocalized(e) == IsLocalized(f) && CompareNames(e.Name(), f.Name()) == 0;
 }
 
+// True when two entries are plain texts with the same text: such a pair matches under every
+// rule (identical numbers, identical lists, identical texts), so it needs no name class.
+bool SameText(const ResTreeEntry& e, const ResTreeEntry& f) {
+    return e.Kind() == EntryKind::Text && f.Kind() == EntryKind::Text && *e.Text() == *f.Text();
+}
+
 // The leading decimal digits of TEXT as a number; 0 when there are none.
 uint64_t LeadingNumber(std::u16string_view text) {
     uint64_t value = 0;
@@ -229,17 +235,24 @@ uint32_t CompareWalk::SortedEntries(ResTreeNode& a, ResTreeNode& b, Tally& tally
     for (auto e = a.Begin(); e != a.End(); ++e) {
         if (IsLocalized(*e))
             continue;
-        const uint8_t nameClass = ClassOf(e->Name());
-        if ((nameClass & kIgnoredName) != 0)
-            continue;
+        // b's entries before E are passed over whether or not E takes part: an entry E would
+        // skip is passed over by the next one that does, in the same order.
         int order = -1;
         while (f != bEnd && (order = CompareNames(f->Name(), e->Name())) < 0)
             PassOver(b, *f++, tally);
-        if (f == bEnd || order != 0)
+        if (f == bEnd || order != 0) {
+            if ((ClassOf(e->Name()) & kIgnoredName) != 0)
+                continue;
             return Short(CompareReason::Missing, a, *e, nullptr);
+        }
         const ResTreeEntry& counterpart = *f++;
         // A required entry that the offered side holds as a localized text is taken as given.
-        if (IsLocalized(counterpart))
+        // Equal plain texts match whatever the rules make of their name, and a counterpart of an
+        // ignored entry is ignored too (their names are equal), so most pairs need no class.
+        if (IsLocalized(counterpart) || SameText(*e, counterpart))
+            continue;
+        const uint8_t nameClass = ClassOf(e->Name());
+        if ((nameClass & kIgnoredName) != 0)
             continue;
         if (Pair(a, *e, counterpart, nameClass, tally) == kNotSatisfied)
             return kNotSatisfied;
@@ -256,7 +269,7 @@ uint32_t CompareWalk::SequencedEntries(ResTreeNode& a, ResTreeNode& b, Tally& ta
     auto e = a.Begin();
     auto f = b.Begin();
     for (; e != a.End() && f != b.End() && SameSlot(*e, *f); ++e, ++f) {
-        if (IsLocalized(*e))
+        if (IsLocalized(*e) || SameText(*e, *f))
             continue;
         const uint8_t nameClass = ClassOf(e->Name());
         if ((nameClass & kIgnoredName) != 0)
