@@ -87,7 +87,15 @@ template <class F> double Timed(F&& f) {
 }
 
 size_t g_variant = 0;
-std::map<std::string, double> g_summary;
+// Each repetition's median ratio per figure; the summary prints the median over repetitions.
+std::map<std::string, std::vector<double>> g_summary;
+
+// Records FIGURE's median for this repetition and answers it for the run's counter.
+double Note(const std::string& figure, std::vector<double>& ratios) {
+    const double median = Median(ratios);
+    g_summary[figure].push_back(median);
+    return median;
+}
 
 // One iteration measures, on a fresh pair: the whole call against two raw parses; one load
 // against one raw parse; the walk over two loaded trees and the destruction of one, each
@@ -131,14 +139,13 @@ void BM_HostCost(benchmark::State& state) {
         state.ResumeTiming();
     }
     const std::string size = std::to_string(resources);
-    state.counters["call_vs_2_raw"] = g_summary["call / two raw parses, " + size] = Median(call);
-    state.counters["load_vs_raw"] = g_summary["load / raw parse, " + size] = Median(load);
-    state.counters["load_utf8_vs_raw"] = g_summary["load of UTF-8 / raw parse, " + size] =
-        Median(loadUtf8);
+    state.counters["call_vs_2_raw"] = Note("call / two raw parses, " + size, call);
+    state.counters["load_vs_raw"] = Note("load / raw parse, " + size, load);
+    state.counters["load_utf8_vs_raw"] = Note("load of UTF-8 / raw parse, " + size, loadUtf8);
     state.counters["load_utf8_vs_noop"] =
-        g_summary["load of UTF-8 / parse with no-op handlers, " + size] = Median(loadNoOp);
-    state.counters["walk_vs_load"] = g_summary["walk / load, " + size] = Median(walk);
-    state.counters["destroy_vs_load"] = g_summary["destroy / load, " + size] = Median(destroy);
+        Note("load of UTF-8 / parse with no-op handlers, " + size, loadNoOp);
+    state.counters["walk_vs_load"] = Note("walk / load, " + size, walk);
+    state.counters["destroy_vs_load"] = Note("destroy / load, " + size, destroy);
 }
 
 // The walk alone, over the same two loaded trees again and again (what a profile of the walk
@@ -271,8 +278,8 @@ int main(int argc, char** argv) {
     ReportCacheMemory();
     SummaryReporter reporter;
     benchmark::RunSpecifiedBenchmarks(&reporter);
-    for (const auto& [name, ratio] : g_summary)
-        std::printf("%s: %.3f\n", name.c_str(), ratio);
+    for (const auto& [name, ratios] : g_summary)
+        std::printf("%s: %.3f (median of %zu runs)\n", name.c_str(), Median(ratios), ratios.size());
     for (const auto& [kind, perSize] : g_perItem) {
         if (perSize.size() == 2)
             std::printf("%s: time per item at 40k / at 10k: %.2f\n", kind.c_str(),
