@@ -13,6 +13,12 @@ std::u16string ItemName(IwbProjectItem& item) {
     return qv::com::BstrToString(name);
 }
 
+GUID ItemType(IwbProjectItem& item) {
+    GUID type{};
+    CheckStatus(item.GetTypeGuid(&type));
+    return type;
+}
+
 qv::com::ComPtr<IwbProjectItem> ItemParent(IwbProjectItem& item) {
     qv::com::ComPtr<IwbProjectItem> parent;
     CheckStatus(item.GetParent(parent.Put()));

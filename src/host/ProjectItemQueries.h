@@ -10,6 +10,8 @@
 namespace qv::host {
 
 std::u16string ItemName(IwbProjectItem& item);
+// The type GUID of ITEM.
+GUID ItemType(IwbProjectItem& item);
 // The parent of ITEM; empty at the project root.
 qv::com::ComPtr<IwbProjectItem> ItemParent(IwbProjectItem& item);
 // The object behind ITEM; empty when it has none.

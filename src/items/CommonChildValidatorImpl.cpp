@@ -14,14 +14,9 @@ using qv::com::ComPtr;
 using qv::com::GuardCall;
 using qv::com::QueryAs;
 using qv::host::CheckStatus;
+using qv::host::ItemType;
 
 namespace {
-
-GUID TypeOf(IwbProjectItem& item) {
-    GUID type{};
-    CheckStatus(item.GetTypeGuid(&type));
-    return type;
-}
 
 // The property NAME of CANDIDATE's object; a candidate without properties, or without that one,
 // throws E_FAIL.
@@ -41,7 +36,7 @@ std::u16string CandidateProperty(IUnknown* candidate, std::u16string_view name) 
 // The common answer for an item of TYPE below PARENT, walking up through folders.
 HRESULT CommonAnswer(ComPtr<IwbProjectItem> parent, const GUID& type) {
     while (parent) {
-        const GUID parentType = TypeOf(*parent.Get());
+        const GUID parentType = ItemType(*parent.Get());
         if (IsEqualGUID(parentType, item_type::kAlwaysAllows))
             return S_OK;
         if (IsEqualGUID(parentType, item_type::kFolder) ||
@@ -110,7 +105,7 @@ HRESULT CommonChildValidatorImpl::CheckPlacement(IwbProjectItem* parent, IUnknow
         CheckStatus(service->GetResourceTree(root.Put()));
         const qv::host::ResourceNode tree(root.Get());
         HostDefinition required;
-        const std::u16string host = qv::kern::GuidToString(TypeOf(*parent));
+        const std::u16string host = qv::kern::GuidToString(ItemType(*parent));
         if (const HRESULT found = FindHostDefinition(tree, host, required); found != S_OK)
             return found;
         return IsHostSupported(required, tree, targetClass) ? S_FALSE : E_FAIL;

@@ -3,6 +3,7 @@
 #include "attribute_bag/ItemResourceContext.h"
 #include "com/CallGuard.h"
 #include "com/TaskMem.h"
+#include "host/ProjectItemQueries.h"
 #include "host/StatusError.h"
 #include "items/TIOInstanceItemUI.h"
 #include "items/TIOItemCommands.h"
@@ -118,9 +119,7 @@ std::u16string TIOInstanceItemUI::DropChainText() {
         chain += qv::com::BstrToString(list.names[i]) + u"." +
                  qv::kern::GuidToString(list.types[i]) + u">>";
     }
-    GUID type{};
-    CheckStatus(HostItem()->GetTypeGuid(&type));
-    return chain + HostItemName() + u"." + qv::kern::GuidToString(type);
+    return chain + HostItemName() + u"." + qv::kern::GuidToString(qv::host::ItemType(*HostItem()));
 }
 
 HRESULT TIOInstanceItemUI::Dropped() {

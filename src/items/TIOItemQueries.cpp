@@ -252,9 +252,7 @@ HRESULT TIOInstanceItemUI::GetScope(uint32_t* count, GUID** types, BSTR** names)
         ComPtr<IwbProjectItem> start;
         CheckStatus(HostItem()->GetParent(start.Put()));
         for (ComPtr<IwbProjectItem> at = start; at;) {
-            GUID type{};
-            CheckStatus(at->GetTypeGuid(&type));
-            chainTypes.insert(chainTypes.begin(), type);
+            chainTypes.insert(chainTypes.begin(), qv::host::ItemType(*at.Get()));
             chainNames.insert(chainNames.begin(), qv::host::ItemName(*at.Get()));
             if (at.Get() == context.Owner())
                 break;

@@ -4,6 +4,7 @@
 #include "attribute_bag/ItemResourceContext.h"
 #include "attribute_bag/TIOAttrBag.h"
 #include "com/CallGuard.h"
+#include "host/ProjectItemQueries.h"
 #include "host/StatusError.h"
 #include "host/contracts/IwbTargetItemChange.h"
 #include "items/TIOInstanceItemUI.h"
@@ -55,9 +56,7 @@ ComPtr<IwbProjectItem> ChildNamed(IwbProjectItem& at, const std::u16string& name
 // The folder NAME below AT, made when absent.
 ComPtr<IwbProjectItem> FolderBelow(IwbProjectItem& at, const std::u16string& name) {
     if (ComPtr<IwbProjectItem> existing = ChildNamed(at, name)) {
-        GUID type{};
-        CheckStatus(existing->GetTypeGuid(&type));
-        if (!IsEqualGUID(type, wbproj::kFolderType))
+        if (!IsEqualGUID(qv::host::ItemType(*existing.Get()), wbproj::kFolderType))
             QV_THROW(qv::host::StatusError(kNameTaken));
         return existing;
     }

@@ -107,12 +107,10 @@ int RunAddItems(const HostOptions& options, const std::string& projectPath,
         return kProjectFailed;
     }
     session::HostSession session;
-    if (!StartProjectSession(options, session, projectPath, err))
-        return kProjectFailed;
-    project::Project& project = *session.Project();
-    ProjectItem* target = FindTarget(project, targetName, err);
+    ProjectItem* const target = OpenProjectTarget(options, session, projectPath, targetName, err);
     if (target == nullptr)
         return kProjectFailed;
+    project::Project& project = *session.Project();
     auto* const create = session.Module()->Find<CreateMultipleFn>("TIO_CreateMultiple");
     if (create == nullptr) {
         err << "wbhost: the loaded module does not export TIO_CreateMultiple\n";

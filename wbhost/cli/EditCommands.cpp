@@ -218,12 +218,11 @@ std::string EditedDescriptionPath(const std::string& projectPath, std::u16string
 int RunEdit(const HostOptions& options, const std::string& projectPath, const EditRequest& request,
             std::ostream& out, std::ostream& err) {
     session::HostSession session;
-    if (!StartProjectSession(options, session, projectPath, err))
-        return 1;
-    project::Project& project = *session.Project();
-    ProjectItem* target = FindTarget(project, request.target, err);
+    ProjectItem* const target =
+        OpenProjectTarget(options, session, projectPath, request.target, err);
     if (target == nullptr)
         return 1;
+    project::Project& project = *session.Project();
     const resources::Target& hardware = project.TargetOf(*target)->Target();
     resources::ResourceTree& tree = *hardware.tree;
     const bool applied = request.kind == EditKind::SetProperty

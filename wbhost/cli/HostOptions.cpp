@@ -63,6 +63,14 @@ project::ProjectItem* FindTarget(project::Project& project, std::string_view nam
         << "\" (targets:" << (known.empty() ? " none" : known) << ")\n";
     return nullptr;
 }
+
+project::ProjectItem* OpenProjectTarget(const HostOptions& options, session::HostSession& session,
+                                        const std::string& projectPath, std::string_view targetName,
+                                        std::ostream& err) {
+    if (!StartProjectSession(options, session, projectPath, err))
+        return nullptr;
+    return FindTarget(*session.Project(), targetName, err);
+}
 #if defined(__GNUC__) && !defined(__clang__)
 #pragma GCC diagnostic pop
 #endif

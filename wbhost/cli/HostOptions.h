@@ -34,6 +34,12 @@ void FinishSession(const HostOptions& options, session::HostSession& session, st
 project::ProjectItem* FindTarget(project::Project& project, std::string_view name,
                                  std::ostream& err);
 
+// StartProjectSession, then FindTarget(TARGETNAME) in the project opened: what every command on
+// one target of a project begins with. Null, with the reason on ERR, when any step fails.
+project::ProjectItem* OpenProjectTarget(const HostOptions& options, session::HostSession& session,
+                                        const std::string& projectPath, std::string_view targetName,
+                                        std::ostream& err);
+
 // PATH made absolute, so a project keeps finding its descriptions from any working folder;
 // PATH itself when that fails.
 std::string AbsolutePath(const std::string& path);

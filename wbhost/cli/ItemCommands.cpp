@@ -63,12 +63,11 @@ int RunItem(const HostOptions& options, const std::string& projectPath, const It
         return kExitFailed;
     }
     session::HostSession session;
-    if (!StartProjectSession(options, session, projectPath, err))
-        return kExitFailed;
-    project::Project& project = *session.Project();
-    project::ProjectItem* target = FindTarget(project, request.target, err);
+    project::ProjectItem* const target =
+        OpenProjectTarget(options, session, projectPath, request.target, err);
     if (target == nullptr)
         return kExitFailed;
+    project::Project& project = *session.Project();
     project::ProjectItem* item = ItemAt(*target, FromUtf8(request.item));
     if (item == nullptr) {
         err << "wbhost: target \"" << request.target << "\" has no item \"" << request.item

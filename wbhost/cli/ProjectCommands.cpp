@@ -112,12 +112,11 @@ int RunProjectJson(const HostOptions& options, const std::string& projectPath, s
 int RunAddItem(const HostOptions& options, const std::string& projectPath,
                const AddItemRequest& request, std::ostream& out, std::ostream& err) {
     session::HostSession session;
-    if (!StartProjectSession(options, session, projectPath, err))
-        return kProjectFailed;
-    project::Project& project = *session.Project();
-    ProjectItem* target = FindTarget(project, request.target, err);
+    ProjectItem* const target =
+        OpenProjectTarget(options, session, projectPath, request.target, err);
     if (target == nullptr)
         return kProjectFailed;
+    project::Project& project = *session.Project();
     // Resource paths are kept as the tree writes them, whatever spelling found the node.
     const std::u16string resource = ResourceNodePath(project, *target, FromUtf8(request.resource));
     if (resource.empty()) {
@@ -177,12 +176,10 @@ int RunRemoveItem(const HostOptions& options, const std::string& projectPath,
                   const std::string& targetName, const std::string& itemPath, std::ostream& out,
                   std::ostream& err) {
     session::HostSession session;
-    if (!StartProjectSession(options, session, projectPath, err))
-        return kProjectFailed;
-    project::Project& project = *session.Project();
-    ProjectItem* target = FindTarget(project, targetName, err);
+    ProjectItem* const target = OpenProjectTarget(options, session, projectPath, targetName, err);
     if (target == nullptr)
         return kProjectFailed;
+    project::Project& project = *session.Project();
     ProjectItem* item = ItemAt(*target, FromUtf8(itemPath));
     if (item == nullptr) {
         err << "wbhost: target \"" << targetName << "\" has no item \"" << itemPath << "\"\n";
