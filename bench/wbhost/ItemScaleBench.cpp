@@ -222,26 +222,34 @@ bool MeasureInTurns(benchmark::State& state, Pairs& pairs, Small&& small, Large&
     return true;
 }
 
-void BM_OpenAndBind(benchmark::State& state) {
-    Pairs& pairs = g_pairs["open and bind"];
+// Opens a project of COUNT items, every one made and bound; the processor seconds of the
+// opening, or a negative number when it failed. BOUND receives how many items came out bound.
+double OpenAndBind(int count, double* bound) {
+    double seconds = -1;
+    const auto session = OpenScaleProject(count, true, &seconds);
+    if (!session)
+        return -1;
+    *bound += ItemsWith(*session, 0, u"/C0/");
+    return seconds;
+}
+
+// Runs MEASURE(count, &bound) on 1,000 and 10,000 items in turns, as PAIRS NAME, and reports
+// the pairs and how many items came out bound per pair.
+template <class Measure>
+void MeasureBoundPairs(benchmark::State& state, const char* name, Measure&& measure,
+                       const char* why) {
+    Pairs& pairs = g_pairs[name];
     double bound = 0;
-    for (auto _ : state) {
-        state.PauseTiming();
-        double seconds[2] = {0, 0};
-        const bool smallFirst = state.iterations() % 2 == 0;
-        for (const int count : {smallFirst ? kSmall : kLarge, smallFirst ? kLarge : kSmall}) {
-            auto session = OpenScaleProject(count, true, &seconds[count == kLarge]);
-            if (!session) {
-                state.SkipWithError("the project does not open");
-                return;
-            }
-            bound += ItemsWith(*session, 0, u"/C0/");
-        }
-        pairs.Add(seconds[0], seconds[1]);
-        state.ResumeTiming();
-    }
+    if (!MeasureInTurns(
+            state, pairs, [&] { return measure(kSmall, &bound); },
+            [&] { return measure(kLarge, &bound); }, why))
+        return;
     pairs.Report(state);
     state.counters["items_bound_per_pair"] = bound / static_cast<double>(state.iterations());
+}
+
+void BM_OpenAndBind(benchmark::State& state) {
+    MeasureBoundPairs(state, "open and bind", OpenAndBind, "the project does not open");
 }
 
 // One project open for the connector renames: its tree, and which name the connector has now.
@@ -324,24 +332,7 @@ double CreateMultiple(int count, double* bound) {
 }
 
 void BM_CreateMultiple(benchmark::State& state) {
-    Pairs& pairs = g_pairs["create in one call"];
-    double bound = 0;
-    for (auto _ : state) {
-        state.PauseTiming();
-        double seconds[2] = {0, 0};
-        const bool smallFirst = state.iterations() % 2 == 0;
-        for (const int count : {smallFirst ? kSmall : kLarge, smallFirst ? kLarge : kSmall}) {
-            seconds[count == kLarge] = CreateMultiple(count, &bound);
-            if (seconds[count == kLarge] < 0) {
-                state.SkipWithError("the items cannot be created");
-                return;
-            }
-        }
-        pairs.Add(seconds[0], seconds[1]);
-        state.ResumeTiming();
-    }
-    pairs.Report(state);
-    state.counters["items_bound_per_pair"] = bound / static_cast<double>(state.iterations());
+    MeasureBoundPairs(state, "create in one call", CreateMultiple, "the items cannot be created");
 }
 
 // Processor seconds of ten judgements of a free name for the first item of SESSION's target
