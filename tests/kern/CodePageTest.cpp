@@ -21,7 +21,7 @@ public:
 
 } // namespace
 
-TEST(CodePage, DefaultIsWindows1252AndKeepsEveryByte) {
+TEST(CodePage, DefaultIsWindows1252UnlessTheEnvironmentChoosesAndKeepsEveryByte) {
     unsetenv("WBTANGIO_CODEPAGE");
     EXPECT_EQ(AnsiToWide("\x80 caf\xE9"), u"\u20AC caf\u00E9");
     EXPECT_EQ(WideToAnsi(u"\u20AC caf\u00E9"), "\x80 caf\xE9");
@@ -32,43 +32,6 @@ TEST(CodePage, DefaultIsWindows1252AndKeepsEveryByte) {
     EXPECT_EQ(WideToAnsi(AnsiToWide(all)), all);
     EXPECT_EQ(AnsiToWide(""), u"");
     EXPECT_EQ(WideToAnsi(u""), "");
-}
-
-TEST(CodePage, NamedPagesAndUnknownNames) {
-    EXPECT_EQ(AnsiToWide("\x93\xFA\x96\x7B", "cp932"), u"\u65E5\u672C");
-    EXPECT_EQ(WideToAnsi(u"A\u65E5\u672C", "cp932"), "A\x93\xFA\x96\x7B");
-    EXPECT_EQ(WideToAnsi(u"caf\u00E9", "US-ASCII"), "caf?");
-    EXPECT_EQ(AnsiToWide("ok", "US-ASCII"), u"ok");
-    EXPECT_THROW(AnsiToWide("x", "utf-8"), InvalidLocale);
-    EXPECT_THROW(WideToAnsi(u"x", "windows-1252"), InvalidLocale);
-    // The name is checked even when there is nothing to convert.
-    EXPECT_THROW(AnsiToWide("", "latin1"), InvalidLocale);
-}
-
-TEST(CodePage, TextsLongerThanADecodingBlockComeWhole) {
-    // Whole descriptions are decoded a block at a time; double-byte characters and a trailing
-    // bad byte must come out the same across the blocks' edges.
-    std::string bytes = "A";
-    std::u16string wide = u"A";
-    for (int i = 0; i < 20000; ++i) {
-        bytes += "\x93\xFA";
-        wide += u"\u65E5";
-    }
-    EXPECT_EQ(AnsiToWide(bytes, "cp932"), wide);
-    EXPECT_EQ(AnsiToWide(std::string(40000, 'x') + "\x93", "cp932").size(), 40001u);
-}
-
-TEST(CodePage, CharactersThePageLacksBecomeQuestionMarks) {
-    unsetenv("WBTANGIO_CODEPAGE");
-    EXPECT_EQ(WideToAnsi(u"a\u65E5b"), "a?b");
-    // An unpaired surrogate is not a character of any page.
-    EXPECT_EQ(WideToAnsi(std::u16string(u"a") + char16_t(0xD800) + u"b"), "a?b");
-    // Invisible format characters too: a name must not lose them without a trace.
-    EXPECT_EQ(WideToAnsi(u"a\u200Bb\u202C", "US-ASCII"), "a?b?");
-    EXPECT_EQ(WideToAnsi(u"a\u200Bb", "cp932"), "a?b");
-}
-
-TEST(CodePage, EnvironmentChoosesTheDefault) {
     {
         const ScopedCodePage page("cp932");
         EXPECT_EQ(AnsiToWide("\x93\xFA"), u"\u65E5");
@@ -79,4 +42,33 @@ TEST(CodePage, EnvironmentChoosesTheDefault) {
         EXPECT_THROW(AnsiToWide("x"), InvalidLocale);
     }
     EXPECT_EQ(AnsiToWide("\xE9"), u"\u00E9");
+}
+
+TEST(CodePage, NamedPagesUnknownNamesLongTextsAndCharactersThePageLacks) {
+    EXPECT_EQ(AnsiToWide("\x93\xFA\x96\x7B", "cp932"), u"\u65E5\u672C");
+    EXPECT_EQ(WideToAnsi(u"A\u65E5\u672C", "cp932"), "A\x93\xFA\x96\x7B");
+    EXPECT_EQ(WideToAnsi(u"caf\u00E9", "US-ASCII"), "caf?");
+    EXPECT_EQ(AnsiToWide("ok", "US-ASCII"), u"ok");
+    EXPECT_THROW(AnsiToWide("x", "utf-8"), InvalidLocale);
+    EXPECT_THROW(WideToAnsi(u"x", "windows-1252"), InvalidLocale);
+    // The name is checked even when there is nothing to convert.
+    EXPECT_THROW(AnsiToWide("", "latin1"), InvalidLocale);
+    // Whole descriptions are decoded a block at a time; double-byte characters and a trailing
+    // bad byte must come out the same across the blocks' edges.
+    std::string bytes = "A";
+    std::u16string wide = u"A";
+    for (int i = 0; i < 20000; ++i) {
+        bytes += "\x93\xFA";
+        wide += u"\u65E5";
+    }
+    EXPECT_EQ(AnsiToWide(bytes, "cp932"), wide);
+    EXPECT_EQ(AnsiToWide(std::string(40000, 'x') + "\x93", "cp932").size(), 40001u);
+    // Characters the page lacks become question marks.
+    unsetenv("WBTANGIO_CODEPAGE");
+    EXPECT_EQ(WideToAnsi(u"a\u65E5b"), "a?b");
+    // An unpaired surrogate is not a character of any page.
+    EXPECT_EQ(WideToAnsi(std::u16string(u"a") + char16_t(0xD800) + u"b"), "a?b");
+    // Invisible format characters too: a name must not lose them without a trace.
+    EXPECT_EQ(WideToAnsi(u"a\u200Bb\u202C", "US-ASCII"), "a?b?");
+    EXPECT_EQ(WideToAnsi(u"a\u200Bb", "cp932"), "a?b");
 }

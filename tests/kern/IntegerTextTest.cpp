@@ -9,7 +9,7 @@ using qv::kern::IntegerToString;
 using qv::kern::StringToInteger;
 using qv::kern::exception::UnableToConvert;
 
-TEST(IntegerText, WritesUpperCaseDigitsInAnyBase) {
+TEST(IntegerText, WritesUpperCaseDigitsInAnyBaseAndReadsThemBack) {
     EXPECT_EQ(IntegerToString(255, 16), u"FF");
     EXPECT_EQ(IntegerToString(0, 10), u"0");
     EXPECT_EQ(IntegerToString(0xFFFFFFFFu, 2), std::u16string(32, u'1'));
@@ -18,9 +18,6 @@ TEST(IntegerText, WritesUpperCaseDigitsInAnyBase) {
     EXPECT_THROW(IntegerToString(1, 0), UnableToConvert);
     EXPECT_THROW(IntegerToString(1, 1), UnableToConvert);
     EXPECT_THROW(IntegerToString(1, 37), UnableToConvert);
-}
-
-TEST(IntegerText, ReadsBackWhatItWrites) {
     for (const uint32_t base : {2u, 8u, 10u, 16u, 36u}) {
         for (const uint32_t value : {0u, 1u, 35u, 36u, 65535u, 0x7FFFFFFFu, 0xFFFFFFFFu}) {
             EXPECT_EQ(StringToInteger(IntegerToString(value, base), base, nullptr, true), value);
@@ -28,7 +25,7 @@ TEST(IntegerText, ReadsBackWhatItWrites) {
     }
 }
 
-TEST(IntegerText, StrictFlagDecidesAboutTrailingText) {
+TEST(IntegerText, ReadsSkippingSpaceNotingTheSignStrictAboutTrailingTextAndOverflow) {
     bool minus = true;
     EXPECT_THROW(StringToInteger(u"12x", 10, &minus, true), UnableToConvert);
     EXPECT_EQ(StringToInteger(u"12x", 10, &minus, false), 12u);
@@ -39,10 +36,6 @@ TEST(IntegerText, StrictFlagDecidesAboutTrailingText) {
     // A NUL inside the given length ends the number early.
     EXPECT_THROW(StringToInteger(std::u16string_view(u"7\0", 2), 10, nullptr, true),
                  UnableToConvert);
-}
-
-TEST(IntegerText, SkipsSpaceAndNotesTheSign) {
-    bool minus = false;
     EXPECT_EQ(StringToInteger(u" \t-42", 10, &minus, true), 42u);
     EXPECT_TRUE(minus);
     EXPECT_EQ(StringToInteger(u"+7", 10, &minus, true), 7u);
@@ -52,9 +45,7 @@ TEST(IntegerText, SkipsSpaceAndNotesTheSign) {
     // Letters of other scripts are not digits.
     EXPECT_EQ(StringToInteger(u"1\uFF12", 10, nullptr, false), 1u);
     EXPECT_EQ(StringToInteger(u"1\u0131", 36, nullptr, false), 1u);
-}
-
-TEST(IntegerText, OverflowRaisesEvenWhenNotStrict) {
+    // Overflow raises even when not strict.
     EXPECT_EQ(StringToInteger(u"4294967295", 10, nullptr, true), 0xFFFFFFFFu);
     EXPECT_THROW(StringToInteger(u"4294967296", 10, nullptr, false), UnableToConvert);
     EXPECT_THROW(StringToInteger(u"100000000", 16, nullptr, false), UnableToConvert);

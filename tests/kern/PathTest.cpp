@@ -10,22 +10,19 @@ using qv::kern::JoinPath;
 using qv::kern::ToLongPathForm;
 using qv::kern::exception::InvalidArgument;
 
-TEST(Path, JoinsWithOneSeparator) {
+TEST(Path, JoinsAndEndsWithOneSeparatorOnlyWhereMissing) {
     EXPECT_EQ(JoinPath("/opt/wb", "wbtio"), "/opt/wb/wbtio");
     EXPECT_EQ(JoinPath("/opt/wb/", "wbtio"), "/opt/wb/wbtio");
     EXPECT_EQ(JoinPath("", "wbtio"), "wbtio");
     EXPECT_EQ(JoinPath("/opt", ""), "/opt");
     EXPECT_EQ(JoinPath("/opt", "/etc/x"), "/etc/x");
-}
-
-TEST(Path, TrailingSeparatorOnlyWhenMissing) {
     EXPECT_EQ(AddTrailingSeparator("/opt/wb"), "/opt/wb/");
     EXPECT_EQ(AddTrailingSeparator("/opt/wb/"), "/opt/wb/");
     EXPECT_EQ(AddTrailingSeparator("/"), "/");
     EXPECT_THROW(AddTrailingSeparator(""), InvalidArgument);
 }
 
-TEST(Path, LongFormOfDriveAndNetworkPaths) {
+TEST(Path, LongFormOfDriveNetworkAndRelativePathsLeavingPrefixedAndEmptyOnesAlone) {
     const std::u16string_view cwd = u"C:\\work\\proj";
     EXPECT_EQ(ToLongPathForm(u"D:\\a\\b\\..\\c.gx", cwd), u"\\\\?\\D:\\a\\c.gx");
     EXPECT_EQ(ToLongPathForm(u"//server/share/dir/name.gx", cwd),
@@ -36,10 +33,7 @@ TEST(Path, LongFormOfDriveAndNetworkPaths) {
     EXPECT_EQ(ToLongPathForm(u"C:\\..\\..\\x", cwd), u"\\\\?\\C:\\x");
     EXPECT_EQ(ToLongPathForm(u"C:/a/./b//c/", cwd), u"\\\\?\\C:\\a\\b\\c\\");
     EXPECT_EQ(ToLongPathForm(u"C:\\a\\..", cwd), u"\\\\?\\C:\\");
-}
-
-TEST(Path, LongFormResolvesRelativePathsAgainstTheCurrentDirectory) {
-    const std::u16string_view cwd = u"C:\\work\\proj";
+    // Relative paths resolve against the current directory.
     EXPECT_EQ(ToLongPathForm(u"sub\\x.gx", cwd), u"\\\\?\\C:\\work\\proj\\sub\\x.gx");
     EXPECT_EQ(ToLongPathForm(u"..\\x.gx", cwd), u"\\\\?\\C:\\work\\x.gx");
     EXPECT_EQ(ToLongPathForm(u".", cwd), u"\\\\?\\C:\\work\\proj");
@@ -49,9 +43,6 @@ TEST(Path, LongFormResolvesRelativePathsAgainstTheCurrentDirectory) {
     EXPECT_EQ(ToLongPathForm(u"x", u"\\\\srv\\share\\d"), u"\\\\?\\UNC\\srv\\share\\d\\x");
     EXPECT_EQ(ToLongPathForm(u"\\x", u"\\\\srv\\share\\d"), u"\\\\?\\UNC\\srv\\share\\x");
     EXPECT_THROW(ToLongPathForm(u"x", u"relative\\dir"), InvalidArgument);
-}
-
-TEST(Path, LongFormLeavesPrefixedAndEmptyPathsAlone) {
     EXPECT_EQ(ToLongPathForm(u"\\\\?\\C:\\a\\..\\b", u"C:\\"), u"\\\\?\\C:\\a\\..\\b");
     EXPECT_EQ(ToLongPathForm(u"\\\\.\\COM1", u"C:\\"), u"\\\\.\\COM1");
     EXPECT_EQ(ToLongPathForm(u"", u"C:\\"), u"");

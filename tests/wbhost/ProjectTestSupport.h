@@ -3,6 +3,7 @@
 // module and a project whose items the module makes.
 #pragma once
 
+#include "TestObjects.h"
 #include "cli/HostedModule.h"
 #include "com/ComObject.h"
 #include "com/ComPtr.h"
@@ -105,11 +106,7 @@ inline std::u16string NameOf(IwbProjectItem* item) {
     return text;
 }
 
-// The text of a BSTR an interface handed out, which is freed.
-inline std::u16string TakeText(BSTR text) {
-    const qv::com::UniqueBstr held(text);
-    return qv::com::BstrToString(text);
-}
+using test::TakeText;
 
 // A session with the build's module and a new project "P" whose target "T" is made from the
 // board text the test names; items are made through the project as the host's tree makes them.

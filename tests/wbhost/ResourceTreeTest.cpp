@@ -11,6 +11,7 @@ namespace {
 
 using qv::com::ComPtr;
 using test::Heard;
+using test::TakeText;
 using wbhost::resources::ResourceService;
 using wbhost::resources::ResourceTree;
 
@@ -54,12 +55,10 @@ protected:
         Answer answer{E_FAIL, 12345, u""};
         ComPtr<IwbhwResourceTreeNode> node;
         answer.status = Object(u"")->FindNode(path, &answer.matched, node.Put());
-        if (node) {
-            BSTR text = nullptr;
+        BSTR text = nullptr;
+        if (node)
             node->GetPath(&text);
-            answer.path = qv::com::BstrToString(text);
-            SysFreeString(text);
-        }
+        answer.path = TakeText(text);
         return answer;
     }
     // Registers OBSERVER on the node at each path with the mask and kind given.
@@ -74,7 +73,7 @@ protected:
     ResourceTree* tree_ = nullptr;
 };
 
-TEST_F(ResourceTreeTest, RenameTellsTheNodeItsParentAndEveryDescendant) {
+TEST_F(ResourceTreeTest, RenameTellsTheNodeItsParentAndEveryDescendantUnlessAmbiguous) {
     auto observer = test::NewObserver();
     Watch(observer.Get(), {u"C0", u"C0/DIO0", u"C0/DIO0/Pins", u"C0/DIO0/Pins/P1", u"C0/DIO1"});
     const auto renamedObject = Object(u"C0/DIO0");
@@ -93,14 +92,12 @@ TEST_F(ResourceTreeTest, RenameTellsTheNodeItsParentAndEveryDescendant) {
     EXPECT_EQ(*At(u"C0/Clock").TextAt(u"Line"), u"0");
     EXPECT_EQ(Object(u"C0/Clock").Get(), renamedObject.Get());
     EXPECT_EQ(At(u"C0").Begin()->Name(), u"Clock");
-}
 
-TEST_F(ResourceTreeTest, RenameRefusesNamesThatWouldMakeAPathAmbiguous) {
-    EXPECT_EQ(tree_->Rename(At(u"C0/DIO0"), u"dio1"), E_INVALIDARG);
-    EXPECT_EQ(tree_->Rename(At(u"C0/DIO0"), u""), E_INVALIDARG);
-    // A change of case only is a rename of its own.
-    EXPECT_EQ(tree_->Rename(At(u"C0/DIO0"), u"dio0"), S_OK);
-    EXPECT_EQ(At(u"C0/DIO0").Name(), u"dio0");
+    // Names that would make a path ambiguous are refused; a change of case only is a rename.
+    EXPECT_EQ(tree_->Rename(At(u"C0/Clock"), u"dio1"), E_INVALIDARG);
+    EXPECT_EQ(tree_->Rename(At(u"C0/Clock"), u""), E_INVALIDARG);
+    EXPECT_EQ(tree_->Rename(At(u"C0/Clock"), u"clock"), S_OK);
+    EXPECT_EQ(At(u"C0/Clock").Name(), u"clock");
 }
 
 TEST_F(ResourceTreeTest, RemovalWarnsDetachesThenTellsTheParent) {
@@ -166,8 +163,7 @@ TEST_F(ResourceTreeTest, PropertiesRaiseAddedChangedRemovedAndDisplayNameBits) {
 
     BSTR value = nullptr;
     EXPECT_EQ(line->GetAttribute(u"note", &value), S_OK);
-    EXPECT_EQ(qv::com::BstrToString(value), u"spare");
-    SysFreeString(value);
+    EXPECT_EQ(TakeText(value), u"spare");
     EXPECT_EQ(line->GetAttribute(u"Missing", &value), S_FALSE);
     EXPECT_EQ(value, nullptr);
 
@@ -235,7 +231,7 @@ TEST_F(ResourceTreeTest, AnObserverMayEditTheTreeWhileBeingTold) {
     EXPECT_TRUE(At(u"C0").IsEmpty());
 }
 
-TEST_F(ResourceTreeTest, FoundPathsMatchWholeAndMissesCountTheNamesThatLed) {
+TEST_F(ResourceTreeTest, FoundPathsMatchWholeMissesCountTheNamesThatLedRelativeFromANode) {
     EXPECT_EQ(Find(u"C0/DIO0"), (Answer{S_OK, 7, u"/C0/DIO0"}));
     EXPECT_EQ(Find(u"c0/dio0"), (Answer{S_OK, 7, u"/C0/DIO0"}));
     EXPECT_EQ(Find(u""), (Answer{S_OK, 0, u"/"}));
@@ -250,9 +246,8 @@ TEST_F(ResourceTreeTest, FoundPathsMatchWholeAndMissesCountTheNamesThatLed) {
     EXPECT_EQ(Find(u"Clock"), (Answer{S_OK, 5, u"/C0/DIO0"}));
     EXPECT_EQ(Find(u"C0/./DIO0/../../A\\/B"), (Answer{S_OK, 20, uR"(/A\/B)"}));
     EXPECT_EQ(Find(u".."), (Answer{S_FALSE, 0, u""}));
-}
 
-TEST_F(ResourceTreeTest, LookupsFromANodeAreRelativeUnlessTheyStartAtTheRoot) {
+    // From a node, lookups are relative unless they start at the root.
     const auto connector = Object(u"C0");
     ComPtr<IwbhwResourceTreeNode> line;
     EXPECT_EQ(connector->FindNode(u"DIO0", nullptr, line.Put()), S_OK);
@@ -266,28 +261,24 @@ TEST_F(ResourceTreeTest, LookupsFromANodeAreRelativeUnlessTheyStartAtTheRoot) {
 TEST_F(ResourceTreeTest, ChildrenAttributesAndTypesAreTheNodesEntries) {
     uint32_t count = 0;
     IwbhwResourceTreeNode** children = nullptr;
+    const auto release = [&] {
+        for (uint32_t i = 0; i < count; ++i)
+            children[i]->Release();
+        CoTaskMemFree(children);
+    };
     ASSERT_EQ(Object(u"C0")->GetChildrenOfType(u"digitalline", &count, &children), S_OK);
     ASSERT_EQ(count, 2u);
-    BSTR type = nullptr;
+    BSTR type = nullptr, name = nullptr, value = nullptr;
     EXPECT_EQ(children[1]->GetElementType(&type), S_OK);
-    EXPECT_EQ(qv::com::BstrToString(type), u"DigitalLine");
-    SysFreeString(type);
-    BSTR name = nullptr;
-    BSTR value = nullptr;
+    EXPECT_EQ(TakeText(type), u"DigitalLine");
     EXPECT_EQ(children[1]->GetAttributeAt(0, &name, &value), S_OK);
-    EXPECT_EQ(qv::com::BstrToString(name) + u"=" + qv::com::BstrToString(value), u"Line=1");
-    SysFreeString(name);
-    SysFreeString(value);
+    EXPECT_EQ(TakeText(name) + u"=" + TakeText(value), u"Line=1");
     EXPECT_EQ(children[1]->GetAttributeAt(1, &name, &value), S_FALSE);
-    for (uint32_t i = 0; i < count; ++i)
-        children[i]->Release();
-    CoTaskMemFree(children);
+    release();
     // Links are followed by lookups but are not children.
     ASSERT_EQ(Object(u"")->GetChildren(&count, &children), S_OK);
     EXPECT_EQ(count, 2u);
-    for (uint32_t i = 0; i < count; ++i)
-        children[i]->Release();
-    CoTaskMemFree(children);
+    release();
 }
 
 } // namespace

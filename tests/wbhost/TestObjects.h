@@ -1,7 +1,8 @@
 // COM objects that tests hand to the resource service: an observer that records what it hears
-// and a project item that only has an identity.
+// and a project item that only has an identity; and the text of a BSTR handed out.
 #pragma once
 
+#include "com/Bstr.h"
 #include "com/ComObject.h"
 #include "com/ComPtr.h"
 #include "host/contracts/IwbProjectItem.h"
@@ -13,6 +14,12 @@
 #include <vector>
 
 namespace test {
+
+// The text of a BSTR an interface handed out, which is freed.
+inline std::u16string TakeText(BSTR text) {
+    const qv::com::UniqueBstr held(text);
+    return qv::com::BstrToString(text);
+}
 
 struct Heard {
     std::u16string path; // the node's path when it was told
@@ -31,8 +38,7 @@ public:
         BSTR path = nullptr;
         if (asNode)
             asNode->GetPath(&path);
-        heard.push_back({qv::com::BstrToString(path), events, kind});
-        SysFreeString(path);
+        heard.push_back({TakeText(path), events, kind});
         if (onEvent)
             onEvent(asNode.Get(), events);
         return S_OK;

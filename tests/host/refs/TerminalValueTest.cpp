@@ -21,7 +21,7 @@ template <class T> T Stored(NumericClass cls, double value) {
     return result;
 }
 
-TEST(TerminalValue, IntegersTruncateTowardsZeroAndKeepTheLowBytes) {
+TEST(TerminalValue, IntegersTruncateTowardsZeroKeepTheLowBytesOrAreIndefinite) {
     EXPECT_EQ(Stored<uint8_t>(NumericClassOfTypeCode(5), 300.0), 44);
     EXPECT_EQ(Stored<int8_t>(NumericClass::kI8, -2.9), -2);
     EXPECT_EQ(Stored<uint16_t>(NumericClass::kU16, -1.0), 0xFFFF);
@@ -32,9 +32,7 @@ TEST(TerminalValue, IntegersTruncateTowardsZeroAndKeepTheLowBytes) {
     EXPECT_EQ(Stored<uint64_t>(NumericClass::kU64, 9223372036854775808.0 + 4096.0),
               (uint64_t{1} << 63) + 4096);
     EXPECT_EQ(Stored<uint64_t>(NumericClass::kU64, 12.5), 12u);
-}
-
-TEST(TerminalValue, ValuesWithoutAnIntegerGiveTheIndefiniteIntegerNotGarbage) {
+    // Values without an integer give the indefinite integer, not garbage.
     const double nan = std::numeric_limits<double>::quiet_NaN();
     EXPECT_EQ(Stored<int32_t>(NumericClass::kI32, nan), std::numeric_limits<int32_t>::min());
     EXPECT_EQ(Stored<int32_t>(NumericClass::kI32, 3e9), std::numeric_limits<int32_t>::min());
@@ -42,21 +40,15 @@ TEST(TerminalValue, ValuesWithoutAnIntegerGiveTheIndefiniteIntegerNotGarbage) {
     EXPECT_EQ(Stored<uint8_t>(NumericClass::kU8, HUGE_VAL), 0);
 }
 
-TEST(TerminalValue, BooleansAreOneUnlessExactlyZero) {
+TEST(TerminalValue, BooleansAreOneUnlessZeroFloatsTheNearestValueOthersLeaveTheDataAlone) {
     const NumericClass boolean = NumericClassOfTypeCode(33);
     EXPECT_EQ(Stored<uint8_t>(boolean, -0.0), 0);
     EXPECT_EQ(Stored<uint8_t>(boolean, 0.0), 0);
     EXPECT_EQ(Stored<uint8_t>(boolean, std::numeric_limits<double>::quiet_NaN()), 1);
     EXPECT_EQ(Stored<uint8_t>(boolean, 1e-300), 1);
-}
-
-TEST(TerminalValue, FloatsTakeTheNearestValueOfTheirWidth) {
     EXPECT_EQ(Stored<double>(NumericClassOfTypeCode(10), 0.1), 0.1);
     EXPECT_EQ(Stored<float>(NumericClassOfTypeCode(9), 0.1), 0.1f);
     EXPECT_TRUE(std::isinf(Stored<float>(NumericClass::kF32, 1e300)));
-}
-
-TEST(TerminalValue, ClassesThatAreNotSettableLeaveTheDataAlone) {
     for (uint8_t code : {0, 11, 12, 13, 14, 15, 32, 34, 255}) {
         uint64_t data = 0x1122334455667788u;
         EXPECT_FALSE(StoreTerminalValue(NumericClassOfTypeCode(code), 1.0, &data)) << int(code);

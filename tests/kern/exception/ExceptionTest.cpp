@@ -21,7 +21,7 @@ template <class E> void ExpectTextAndCode(const char* text, uint32_t code) {
 
 } // namespace
 
-TEST(Exception, EachClassHasItsTextAndCode) {
+TEST(Exception, EachClassHasItsTextAndCodeAndThrowKeepsTheRaiseSiteAndDetail) {
     ExpectTextAndCode<ex::Exception>("unspecified exception", 0xFFFFFFFFu);
     ExpectTextAndCode<ex::OutOfRange>("Out of range", 0x8ABC7007u);
     ExpectTextAndCode<ex::InvalidArgument>("Invalid argument(s)", 0x8ABC700Fu);
@@ -32,9 +32,6 @@ TEST(Exception, EachClassHasItsTextAndCode) {
     ExpectTextAndCode<ex::BadGuidString>("Badly formatted Guid string.", 0x8ABC7032u);
     ExpectTextAndCode<ex::UnableToConvert>("Unable to convert.", 0x8ABC7034u);
     ExpectTextAndCode<ex::NotImplemented>("Not implemented", 0x80004001u);
-}
-
-TEST(Exception, ThrowKeepsTheRaiseSiteAndTheDetail) {
     const uint32_t line = __LINE__ + 2;
     try {
         QV_THROW(ex::OutOfRange2("String offset out of range"));
@@ -53,14 +50,11 @@ TEST(Exception, ThrowKeepsTheRaiseSiteAndTheDetail) {
     EXPECT_EQ(ex::Exception().line(), 0u);
 }
 
-TEST(Exception, SubstringBeyondTheEndRaisesOutOfRange2) {
+TEST(Exception, SubstringsBeyondTheEndAndProductsAbove32BitsRaise) {
     const qv::kern::WString s(u"abc");
     EXPECT_EQ(s.substr(3), u"");
     EXPECT_EQ(s.substr(1, 99), u"bc");
     EXPECT_THROW(s.substr(4), ex::OutOfRange2);
-}
-
-TEST(Exception, SafeMultiplyRaisesOnlyAbove32Bits) {
     EXPECT_EQ(qv::kern::SafeMultiply(0x10000u, 0xFFFFu), 0xFFFF0000u);
     EXPECT_EQ(qv::kern::SafeMultiply(0xFFFFFFFFu, 1u), 0xFFFFFFFFu);
     EXPECT_EQ(qv::kern::SafeMultiply(0u, 0xFFFFFFFFu), 0u);

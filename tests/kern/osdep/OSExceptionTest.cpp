@@ -10,15 +10,12 @@
 using qv::kern::osdep::OSException;
 using qv::kern::osdep::WinError;
 
-TEST(OSException, DefaultsToUnknownErrorAndHostCode42) {
+TEST(OSException, WindowsCodesMapToHostCodesAndTheSystemsTextUnknownErrorAnd42ByDefault) {
     const OSException e;
     EXPECT_STREQ(e.what(), "Unknown error");
     EXPECT_EQ(e.GetErrorCode(), 42u);
     EXPECT_EQ(e.GetOSErrorCode(), 0u);
     EXPECT_STREQ(OSException("", 3).what(), "Unknown error");
-}
-
-TEST(OSException, WindowsCodesMapToHostCodesAndTheSystemsText) {
     // One code of each kind: a plain host code, a status kept whole, a negative host code, and
     // codes with no host counterpart, whose text the system cannot give either.
     const struct {
@@ -40,7 +37,7 @@ TEST(OSException, WindowsCodesMapToHostCodesAndTheSystemsText) {
     }
 }
 
-TEST(OSException, LastErrorIsTheFailedCallsErrno) {
+TEST(OSException, LastErrorIsTheFailedCallsErrnoCaughtAsTheBaseOfTheTree) {
     ASSERT_EQ(::open("/nonexistent/dir/file", O_RDONLY), -1);
     const WinError notFound;
     EXPECT_EQ(notFound.GetOSErrorCode(), 2u);
@@ -56,9 +53,6 @@ TEST(OSException, LastErrorIsTheFailedCallsErrno) {
     // An errno without a Windows counterpart becomes a general failure.
     errno = ENOTSOCK;
     EXPECT_EQ(WinError().GetOSErrorCode(), 31u);
-}
-
-TEST(OSException, CaughtAsTheBaseOfTheTree) {
     try {
         QV_THROW(WinError(5));
     } catch (const qv::kern::exception::Exception& e) {
