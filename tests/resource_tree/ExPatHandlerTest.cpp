@@ -44,13 +44,10 @@ TEST(ExPatHandler, DeliversWideEventsWholeOrOneByteAtATime) {
     EXPECT_EQ(bytewise.log, kExpected);
 }
 
-TEST(ExPatHandler, HandlerExceptionIsRethrownAfterExpatReturns) {
-    Recorder r;
-    r.throwOnStart = true;
-    EXPECT_THROW(r.Parse("<a><b/></a>", true), std::runtime_error);
-}
-
-TEST(ExPatHandler, ReportsErrorWithLineAndColumn) {
+TEST(ExPatHandler, HandlerExceptionsAreRethrownAfterExpatReturnsErrorsWithLineAndColumn) {
+    Recorder throwing;
+    throwing.throwOnStart = true;
+    EXPECT_THROW(throwing.Parse("<a><b/></a>", true), std::runtime_error);
     Recorder r;
     EXPECT_FALSE(r.Parse("<a>\n  <b></a>", true));
     EXPECT_EQ(r.ErrorCode(), XML_ERROR_TAG_MISMATCH);

@@ -8,7 +8,7 @@ namespace wbhw {
 namespace {
 using namespace test;
 
-TEST(ParseElement, LinksStoreThePathFromTheirNodeOrSayUnresolved) {
+TEST(ParseElement, LinksStoreThePathFromTheirNodeOrSayUnresolvedAndKeepTheDocumentWhole) {
     auto root = Load(uR"(<Top>
         <Group name="a"><Group name="pin"/></Group>
         <Group name="b">
@@ -32,11 +32,8 @@ TEST(ParseElement, LinksStoreThePathFromTheirNodeOrSayUnresolved) {
     // From the root the path goes straight down.
     EXPECT_EQ(TextOf(*root, u"fromRoot"), u"a/pin");
     EXPECT_EQ(root->ResolvePath(u"fromRoot"), ChildOf(*ChildOf(*root, u"a"), u"pin"));
-}
-
-TEST(ParseElement, DocumentRootAnchorsJoinOnceWhenTheDocumentIsTheTreeRoot) {
     // The root's own path is "/"; "#{document-root}/a" must not become "//a", which names nothing.
-    auto root = Load(uR"(<Top>
+    root = Load(uR"(<Top>
         <Group name="a"/><Group name="b"/>
         <Group name="user"><Reserves>#{document-root}/a, #{document-root}/b</Reserves>
             <Self>#{document-root}</Self></Group>
@@ -47,15 +44,12 @@ TEST(ParseElement, DocumentRootAnchorsJoinOnceWhenTheDocumentIsTheTreeRoot) {
     EXPECT_EQ(TextOf(*user, u"Self"), u"/");
     EXPECT_EQ(user->ReservedNodes(true),
               (std::vector<ResTreeNode*>{ChildOf(*root, u"a"), ChildOf(*root, u"b")}));
-}
-
-TEST(ParseElement, ALinkWithMarkupInsideKeepsTheDocumentWhole) {
-    auto root = Load(uR"(<Top>
+    root = Load(uR"(<Top>
         <Group name="a"/>
         <Group name="b"><:Link name="l">../a<x><y/></x></:Link><After>1</After></Group>
         <Later>2</Later>
     </Top>)");
-    ResTreeNode* b = ChildOf(*root, u"b");
+    b = ChildOf(*root, u"b");
     ASSERT_NE(b, nullptr);
     EXPECT_EQ(TextOf(*b, u"l"), u"../a");
     EXPECT_EQ(TextOf(*b, u"After"), u"1");

@@ -11,7 +11,7 @@ using namespace test;
 
 constexpr int32_t kFail = static_cast<int32_t>(0x80004005u);
 
-TEST(ParseStack, DocumentElementDescribesTheRootAndChildrenBecomeEntries) {
+TEST(ParseStack, DocumentElementDescribesTheRootOrANewChildAndChildrenBecomeEntries) {
     int32_t result = -1;
     auto root = Load(uR"(<Target name="T">
         <Value>  padded  </Value>
@@ -42,31 +42,23 @@ TEST(ParseStack, DocumentElementDescribesTheRootAndChildrenBecomeEntries) {
     ASSERT_NE(ChildOf(*root, u"Module"), nullptr);
     EXPECT_EQ(root->EntryCount(), 6u);
     EXPECT_EQ(root->Find(u"XMLParseErrors"), root->End());
-}
-
-TEST(ParseStack, AsChildMakesTheDocumentElementANewChild) {
-    ResTreeNode root(u"", u"Target", false);
+    // As a child, the document element makes a new child.
+    ResTreeNode parent(u"", u"Target", false);
     ResTreeNode* out = nullptr;
-    EXPECT_EQ(root.ParseText(u"<Module name='m'><X>1</X></Module>", true, &out), 0);
+    EXPECT_EQ(parent.ParseText(u"<Module name='m'><X>1</X></Module>", true, &out), 0);
     ASSERT_NE(out, nullptr);
-    EXPECT_EQ(out, ChildOf(root, u"m"));
+    EXPECT_EQ(out, ChildOf(parent, u"m"));
     EXPECT_EQ(TextOf(*out, u"X"), u"1");
-    EXPECT_EQ(root.Name(), u"");
+    EXPECT_EQ(parent.Name(), u"");
 }
 
-TEST(ParseStack, OrderedAndNextControlTheEntryOrder) {
+TEST(ParseStack, OrderedAndNextControlTheOrderSameNamedNodesMergeUnlessReplaced) {
     auto root = Load(uR"(<Top ordered="yes"><b/><c/><a next="c"/><z next="missing"/></Top>)");
-    std::vector<std::u16string> names;
-    for (ResTreePosition at = root->Begin(); at != root->End(); ++at)
-        names.push_back(at->Name());
-    EXPECT_EQ(names, (std::vector<std::u16string>{u"b", u"a", u"c", u"z"}));
+    EXPECT_EQ(Names(*root), (std::vector<std::u16string>{u"b", u"a", u"c", u"z"}));
     auto unordered = Load(uR"(<PinList ordered="Off"><b/><a/></PinList>)");
     EXPECT_FALSE(unordered->IsOrdered());
-}
-
-TEST(ParseStack, SameNamedNodesMergeUnlessReplacedAndTextsKeepTheLast) {
     // Another tag replaces the node.
-    auto root = Load(uR"(<Top>
+    root = Load(uR"(<Top>
         <Module name="m"><A>1</A><B>1</B></Module>
         <Module name="M"><A>2</A><C>2</C></Module>
         <Other name="m"><D/></Other>
@@ -97,7 +89,7 @@ TEST(ParseStack, SameNamedNodesMergeUnlessReplacedAndTextsKeepTheLast) {
     EXPECT_EQ(TextOf(*ChildOf(*root, u"b"), u"Y"), u"2");
 }
 
-TEST(ParseStack, XmlTypedElementsCaptureNestedMarkup) {
+TEST(ParseStack, XmlPathAndReferenceTextsAreNormalOnlyTheTextInsideALeafIsGathered) {
     auto root = Load(uR"(<Top>
         <Cfg name="flat" type="xml"><a x="1" B="2">text</a><b/></Cfg>
         <Cfg name="deep" type="xml"><a><b y="&lt;"><c/></b>t</a><d/></Cfg>
@@ -110,10 +102,7 @@ TEST(ParseStack, XmlTypedElementsCaptureNestedMarkup) {
     EXPECT_EQ(TextOf(*root, u"none"), u"");
     EXPECT_EQ(TextOf(*root, u"After"), u"kept");
     EXPECT_EQ(root->EntryCount(), 4u);
-}
-
-TEST(ParseStack, PathTextsAndReferenceLists) {
-    auto root = Load(uR"(<Top>
+    root = Load(uR"(<Top>
         <SomePath>a//b/c/</SomePath>
         <LibDir>/abs/x</LibDir>
         <Plain type="path">p/q</Plain>
@@ -129,10 +118,7 @@ TEST(ParseStack, PathTextsAndReferenceLists) {
     // Written in the document element, the paths go down from the root and resolve.
     EXPECT_EQ(TextOf(*root, u"Reserves"), u"m");
     EXPECT_EQ(root->ReservedNodes(true), std::vector<ResTreeNode*>{ChildOf(*root, u"m")});
-}
-
-TEST(ParseStack, OnlyTheTextInsideALeafIsGathered) {
-    auto root = Load(uR"(<Top>lead
+    root = Load(uR"(<Top>lead
         <A>  x  <!-- a comment splits the text --> y </A>between
         <B xml:space="preserve"> p <![CDATA[<q>]]> </B>tail
         <G>stray<C>1</C>after C</G>
@@ -145,10 +131,8 @@ TEST(ParseStack, OnlyTheTextInsideALeafIsGathered) {
     EXPECT_EQ(Names(*g), std::vector<std::u16string>{u"C"});
     EXPECT_EQ(TextOf(*g, u"C"), u"1");
     EXPECT_EQ(root->EntryCount(), 4u + 1u); // A, B, G, the link's text and the message
-}
-
-TEST(ParseStack, ReferenceListsOfOneReferenceAreTrimmedOrRewrittenAsLongerOnes) {
-    auto root = Load(uR"(<Top>
+    // Reference lists of one reference are trimmed or rewritten as longer ones.
+    root = Load(uR"(<Top>
         <Group name="g">
             <Reserves xml:space="preserve">  ../b  </Reserves>
             <Mine type="ref-list" xml:space="preserve"> /Top/g/x </Mine>
@@ -156,7 +140,7 @@ TEST(ParseStack, ReferenceListsOfOneReferenceAreTrimmedOrRewrittenAsLongerOnes) 
             <Blank type="ref-list" xml:space="preserve">   </Blank>
         </Group>
     </Top>)");
-    ResTreeNode* g = ChildOf(*root, u"g");
+    g = ChildOf(*root, u"g");
     ASSERT_NE(g, nullptr);
     EXPECT_EQ(TextOf(*g, u"Reserves"), u"../b");
     // An absolute reference is found after trimming, even with blanks kept around it.
@@ -180,15 +164,12 @@ TEST(ParseStack, SyntaxErrorsAccumulateWithLineColumnAndContext) {
               u"Error on line 1 at column 5\n   unclosed token\n   <Top><\n");
 }
 
-TEST(ParseStack, TextInputKeepsCharactersBeyondTheBasicPlane) {
+TEST(ParseStack, TextInputKeepsCharactersBeyondTheBasicPlaneAndDeepNestingStopsTheLoad) {
     auto root = Load(u"<Top><V>\U0001F600\u00E9</V></Top>");
     EXPECT_EQ(TextOf(*root, u"V"), u"\U0001F600\u00E9");
     int32_t result = 0;
-    auto lone = Load(u"<Top><V>\xD800</V></Top>", nullptr, &result);
+    Load(u"<Top><V>\xD800</V></Top>", nullptr, &result);
     EXPECT_EQ(result, kFail);
-}
-
-TEST(ParseStack, DeeplyNestedElementsStopTheLoadWithAMessage) {
     LoaderSettings settings;
     settings.maxElementDepth = 50;
     std::u16string doc;
@@ -197,8 +178,7 @@ TEST(ParseStack, DeeplyNestedElementsStopTheLoadWithAMessage) {
     doc += u"<x/>";
     for (int i = 0; i < 80; ++i)
         doc += u"</a>";
-    int32_t result = 0;
-    auto root = Load(doc, &settings, &result);
+    root = Load(doc, &settings, &result);
     EXPECT_EQ(result, kFail);
     EXPECT_NE(TextOf(*root, u"XMLParseErrors").find(u"nested deeper than 50"),
               std::u16string::npos);

@@ -23,7 +23,7 @@ std::string BlockDocument(size_t pad, size_t items) {
     return doc + "</Top>\n";
 }
 
-TEST(ResTreeLoader, FilesLoadAlikeWhereverTheBlocksEnd) {
+TEST(ResTreeLoader, FilesLoadAlikeWhereverTheBlocksEndAndTheirErrorsNameThem) {
     ScratchDirectory dir;
     for (size_t pad = 4000; pad < 4100; pad += 7) {
         const std::string bytes = BlockDocument(pad, 150);
@@ -49,11 +49,8 @@ TEST(ResTreeLoader, FilesLoadAlikeWhereverTheBlocksEnd) {
     ASSERT_EQ(grown->ParseFile(dir.Write("huge.xml", huge), false), 0);
     EXPECT_EQ(grown->EntryCount(), 152u);
     EXPECT_EQ(TextOf(*ChildOf(*grown, u"R149"), u"Label"), u"\u00E9t\u00E9 149");
-}
-
-TEST(ResTreeLoader, FileErrorsNameTheFile) {
-    ScratchDirectory dir;
-    auto root = NewRoot();
+    // Errors name the file.
+    root = NewRoot();
     EXPECT_EQ(root->ParseFile(dir.path() + "/missing.xml", false), kFail);
     EXPECT_EQ(root->Find(u"XMLParseErrors"), root->End());
     EXPECT_EQ(root->ParseFile(dir.path(), false), kFail); // a directory is no document
@@ -64,7 +61,7 @@ TEST(ResTreeLoader, FileErrorsNameTheFile) {
                                                     u"\n   mismatched tag\n   \n<A>\n</B>\n\n");
 }
 
-TEST(ResTreeLoader, IncludesLoadAsAChildOrIntoTheNode) {
+TEST(ResTreeLoader, IncludesLoadAsAChildOrIntoTheNodeAndLoopsStopWithAMessage) {
     ScratchDirectory dir;
     dir.Write("child.xml", "<Module name='inc'><Where>#{site}</Where></Module>");
     dir.Write("children.xml", "<Anything><Merged>yes</Merged></Anything>");
@@ -85,17 +82,12 @@ TEST(ResTreeLoader, IncludesLoadAsAChildOrIntoTheNode) {
                   .find(u"Unable to find include file node: " + FromUtf8Lenient(dir.path()) +
                         u"/missing.xml"),
               std::u16string::npos);
-}
-
-TEST(ResTreeLoader, IncludesThatComeBackAroundStopWithAMessage) {
-    ScratchDirectory dir;
+    // Includes that come back around stop with a message.
     dir.Write("a.xml", "<A><:Include what='children'>b.xml</:Include></A>");
     dir.Write("b.xml", "<B><:Include what='children'>a.xml</:Include></B>");
-    LoaderSettings settings;
-    settings.includeDirectory = dir.path();
     settings.maxNestedLoads = 8;
     int32_t result = -1;
-    auto root = Load(u"<Top><:Include what='children'>a.xml</:Include></Top>", &settings, &result);
+    root = Load(u"<Top><:Include what='children'>a.xml</:Include></Top>", &settings, &result);
     EXPECT_EQ(result, 0);
     EXPECT_NE(TextOf(*root, u"XMLParseErrors").find(u"Loads are nested deeper than 8 levels"),
               std::u16string::npos);

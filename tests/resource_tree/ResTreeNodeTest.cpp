@@ -11,7 +11,7 @@ namespace wbhw {
 namespace {
 using namespace test;
 
-TEST(ResTreeNode, UnorderedNodesKeepOneEntryPerNameSortedAndAnswerTheFirstSpelling) {
+TEST(ResTreeNode, UnorderedNodesKeepOneEntryPerNameSortedOrderedOnesKeepDuplicatesInOrder) {
     ResTreeNode node(u"n", u"IOResource", false);
     // Names arrive out of order, and every fourth one again in other case.
     for (int i = 0; i < 200; ++i) {
@@ -39,24 +39,21 @@ TEST(ResTreeNode, UnorderedNodesKeepOneEntryPerNameSortedAndAnswerTheFirstSpelli
     for (size_t i = 1; i < names.size(); ++i)
         EXPECT_LT(qv::kern::CompareNoCase(names[i - 1], names[i]), 0) << i;
     EXPECT_EQ(*node.Find(u"PINHB")->Text(), u"first");
-}
-
-TEST(ResTreeNode, OrderedNodesKeepDuplicatesInInsertionOrderUntilMadeUnordered) {
-    ResTreeNode node(u"n", u"ResourceList", true);
-    node.AddText(node.End(), u"Pin", u"first");
-    const auto second = node.AddText(node.End(), u"PIN", u"second");
+    ResTreeNode list(u"n", u"ResourceList", true);
+    list.AddText(list.End(), u"Pin", u"first");
+    const auto second = list.AddText(list.End(), u"PIN", u"second");
     EXPECT_TRUE(second.inserted);
-    node.AddText(second.position, u"before", u"");
-    EXPECT_EQ(Names(node), (std::vector<std::u16string>{u"Pin", u"before", u"PIN"}));
-    EXPECT_EQ(*node.Find(u"pin")->Text(), u"first");
-    // Made unordered, the node keeps the first entry of each name, sorted; made ordered again,
+    list.AddText(second.position, u"before", u"");
+    EXPECT_EQ(Names(list), (std::vector<std::u16string>{u"Pin", u"before", u"PIN"}));
+    EXPECT_EQ(*list.Find(u"pin")->Text(), u"first");
+    // Made unordered, the list keeps the first entry of each name, sorted; made ordered again,
     // it keeps them in that order and appends.
-    node.SetOrdered(false);
-    EXPECT_EQ(Names(node), (std::vector<std::u16string>{u"before", u"Pin"}));
-    EXPECT_EQ(TextOf(node, u"PIN"), u"first");
-    node.SetOrdered(true);
-    node.AddText(node.End(), u"BEFORE", u"");
-    EXPECT_EQ(Names(node), (std::vector<std::u16string>{u"before", u"Pin", u"BEFORE"}));
+    list.SetOrdered(false);
+    EXPECT_EQ(Names(list), (std::vector<std::u16string>{u"before", u"Pin"}));
+    EXPECT_EQ(TextOf(list, u"PIN"), u"first");
+    list.SetOrdered(true);
+    list.AddText(list.End(), u"BEFORE", u"");
+    EXPECT_EQ(Names(list), (std::vector<std::u16string>{u"before", u"Pin", u"BEFORE"}));
 }
 
 TEST(ResTreeNode, LargeOrderedNodesFindTheFirstOfEachNameAsAScanWould) {
@@ -114,23 +111,20 @@ TEST(ResTreeNode, TextsAreSetOnlyOnTextEntries) {
     EXPECT_EQ(root.TextAt(u"missing"), nullptr);
 }
 
-TEST(ResTreeNode, PathsEscapeSlashesAndResolveBack) {
-    ResTreeNode root(u"root", u"Target", false);
-    ResTreeNode* ab = root.AddChild(root.End(), u"a/b", u"Module", false).node;
+TEST(ResTreeNode, PathsEscapeSlashesResolveFromAnAnchorOrTheNodeThroughLinksAndLoopsEndInNull) {
+    ResTreeNode top(u"top", u"Target", false);
+    ResTreeNode* ab = top.AddChild(top.End(), u"a/b", u"Module", false).node;
     ResTreeNode* leaf = ab->AddChild(ab->End(), u"c\\d", u"IOResource", false).node;
-    EXPECT_EQ(root.Path(), u"/");
+    EXPECT_EQ(top.Path(), u"/");
     EXPECT_EQ(ab->Path(), u"/a\\/b");
     EXPECT_EQ(leaf->Path(), u"/a\\/b/c\\\\d");
-    EXPECT_EQ(root.ResolvePath(ab->Path()), ab);
+    EXPECT_EQ(top.ResolvePath(ab->Path()), ab);
     EXPECT_EQ(leaf->ResolvePath(leaf->Path()), leaf);
-    EXPECT_EQ(leaf->ResolvePath(u"../.."), &root);
+    EXPECT_EQ(leaf->ResolvePath(u"../.."), &top);
     EXPECT_EQ(leaf->ResolvePath(u"./../C\\\\D"), leaf);
-    EXPECT_EQ(root.ResolvePath(u".."), nullptr);
-    EXPECT_EQ(root.ResolvePath(u""), &root);
-    EXPECT_EQ(root.ResolvePath(u"a\\/b/missing"), nullptr);
-}
-
-TEST(ResTreeNode, DocumentRootAnchorNeedsTheAnchorAndMayStandAlone) {
+    EXPECT_EQ(top.ResolvePath(u".."), nullptr);
+    EXPECT_EQ(top.ResolvePath(u""), &top);
+    EXPECT_EQ(top.ResolvePath(u"a\\/b/missing"), nullptr);
     ResTreeNode root(u"", u"Target", false);
     ResTreeNode* doc = root.AddChild(root.End(), u"doc", u"Module", false).node;
     ResTreeNode* x = doc->AddChild(doc->End(), u"x", u"IOResource", false).node;
@@ -141,24 +135,21 @@ TEST(ResTreeNode, DocumentRootAnchorNeedsTheAnchorAndMayStandAlone) {
     EXPECT_EQ(doc->ResolvePath(u"#{other}/x", x), x);
     // No closing brace: no anchor, just a name that is not there.
     EXPECT_EQ(doc->ResolvePath(u"#{document-root", doc), nullptr);
-}
-
-TEST(ResTreeNode, LinksAreFollowedAndLoopsEndInNull) {
-    ResTreeNode root(u"", u"Target", true);
-    ResTreeNode* a = root.AddChild(root.End(), u"A", u"Module", false).node;
-    root.AddLink(root.End(), u"toA", u"A");
-    root.AddLink(root.End(), u"dangling", u"nowhere");
-    root.AddLink(root.End(), u"empty", u"");
-    EXPECT_EQ(root.NodeAt(root.Find(u"toA")), a);
-    EXPECT_EQ(root.ResolvePath(u"toA"), a);
-    EXPECT_EQ(root.NodeAt(root.Find(u"dangling")), nullptr);
-    EXPECT_EQ(root.NodeAt(root.Find(u"empty")), nullptr);
+    ResTreeNode links(u"", u"Target", true);
+    ResTreeNode* linked = links.AddChild(links.End(), u"A", u"Module", false).node;
+    links.AddLink(links.End(), u"toA", u"A");
+    links.AddLink(links.End(), u"dangling", u"nowhere");
+    links.AddLink(links.End(), u"empty", u"");
+    EXPECT_EQ(links.NodeAt(links.Find(u"toA")), linked);
+    EXPECT_EQ(links.ResolvePath(u"toA"), linked);
+    EXPECT_EQ(links.NodeAt(links.Find(u"dangling")), nullptr);
+    EXPECT_EQ(links.NodeAt(links.Find(u"empty")), nullptr);
     // A link that leads to itself, directly or through another link.
-    root.AddLink(root.Begin(), u"self", u"self");
-    root.AddLink(root.End(), u"p", u"q");
-    root.AddLink(root.End(), u"q", u"p");
-    EXPECT_EQ(root.NodeAt(root.Find(u"self")), nullptr);
-    EXPECT_EQ(root.ResolvePath(u"p/x"), nullptr);
+    links.AddLink(links.Begin(), u"self", u"self");
+    links.AddLink(links.End(), u"p", u"q");
+    links.AddLink(links.End(), u"q", u"p");
+    EXPECT_EQ(links.NodeAt(links.Find(u"self")), nullptr);
+    EXPECT_EQ(links.ResolvePath(u"p/x"), nullptr);
 }
 
 TEST(ResTreeNode, ReservedNodesFollowTheListInOrder) {
@@ -172,7 +163,7 @@ TEST(ResTreeNode, ReservedNodesFollowTheListInOrder) {
     EXPECT_TRUE(user->ReservedNodes(false).empty());
 }
 
-TEST(ResTreeNode, RemovalEmptiesChildrenFromTheEndAndKeepsTexts) {
+TEST(ResTreeNode, RemovalEmptiesChildrenFromTheEndKeepsTextsAndSparesNodesInUse) {
     ResTreeNode root(u"", u"Target", true);
     root.AddText(root.End(), u"t", u"x");
     root.AddLink(root.End(), u"l", u"");
@@ -184,19 +175,16 @@ TEST(ResTreeNode, RemovalEmptiesChildrenFromTheEndAndKeepsTexts) {
     EXPECT_FALSE(root.RemoveAt(root.End()));
     EXPECT_TRUE(root.RemoveAt(root.Find(u"T")));
     EXPECT_EQ(Names(root), std::vector<std::u16string>{u"l"});
-}
-
-TEST(ResTreeNode, NodesInUseByALoadAreNotRemoved) {
-    ResTreeNode root(u"", u"Target", false);
-    ResTreeNode* a = root.AddChild(root.End(), u"a", u"Module", false).node;
+    ResTreeNode holder(u"", u"Target", false);
+    ResTreeNode* a = holder.AddChild(holder.End(), u"a", u"Module", false).node;
     ResTreeNode* deep = a->AddChild(a->End(), u"deep", u"Module", false).node;
     {
         NodeInUse hold(deep);
-        EXPECT_FALSE(root.RemoveAt(root.Find(u"a")));
-        EXPECT_EQ(ChildOf(root, u"a"), a);
+        EXPECT_FALSE(holder.RemoveAt(holder.Find(u"a")));
+        EXPECT_EQ(ChildOf(holder, u"a"), a);
     }
-    EXPECT_TRUE(root.RemoveAt(root.Find(u"a")));
-    EXPECT_TRUE(root.IsEmpty());
+    EXPECT_TRUE(holder.RemoveAt(holder.Find(u"a")));
+    EXPECT_TRUE(holder.IsEmpty());
 }
 
 TEST(TypeRegistry, ListTypesComeFromNamesAndBases) {

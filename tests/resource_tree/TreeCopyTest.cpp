@@ -12,7 +12,7 @@ bool HasError(ResTreeNode& node, std::u16string_view part) {
     return TextOf(node, u"XMLParseErrors").find(part) != std::u16string::npos;
 }
 
-TEST(TreeCopy, NamesRangesCopyTheFirstNodeWithItsVariables) {
+TEST(TreeCopy, NamesListsMixNamesAndRangesCopyingTheFirstNodeCappedOrSkippedWhenHugeOrEmpty) {
     auto root = Load(uR"(<Top ordered="true">
         <First/>
         <IOResource names="DIO[n=0..3]">
@@ -33,26 +33,20 @@ TEST(TreeCopy, NamesRangesCopyTheFirstNodeWithItsVariables) {
         EXPECT_EQ(TextOf(*dio, u"Keep"), u"#{other}");
         EXPECT_EQ(TextOf(*ChildOf(*dio, u"inner"), u"Deep"), name.substr(3));
     }
-}
-
-TEST(TreeCopy, NamesListsMixPlainNamesAndRanges) {
-    auto root = Load(uR"(<Top ordered="true">
+    root = Load(uR"(<Top ordered="true">
         <Port names="A, B[i=2..3]x, C\,D, E[j=5..4]"><Idx>#{i}/#{j}/#{name}</Idx></Port>
     </Top>)");
     EXPECT_EQ(Names(*root), (std::vector<std::u16string>{u"A", u"B2x", u"B3x", u"C,D"}));
     EXPECT_EQ(TextOf(*ChildOf(*root, u"A"), u"Idx"), u"#{i}/#{j}/A");
     EXPECT_EQ(TextOf(*ChildOf(*root, u"B3x"), u"Idx"), u"3/#{j}/B3x");
-}
-
-TEST(TreeCopy, HugeOrEmptyNamesListsAreCappedOrSkipped) {
     LoaderSettings settings;
     settings.maxNames = 100;
-    auto root = Load(uR"(<Top>
+    root = Load(uR"(<Top>
         <Port names="X[i=0..4000000000]"/>
         <Port names="Y[i=9..1]"><Inner><Deeper/></Inner></Port>
         <After/>
     </Top>)",
-                     &settings);
+                &settings);
     EXPECT_EQ(root->EntryCount(), 102u); // 100 names, the messages, After
     EXPECT_NE(ChildOf(*root, u"X99"), nullptr);
     EXPECT_EQ(ChildOf(*root, u"X100"), nullptr);
@@ -62,7 +56,7 @@ TEST(TreeCopy, HugeOrEmptyNamesListsAreCappedOrSkipped) {
     EXPECT_EQ(root->Find(u"Inner"), root->End());
 }
 
-TEST(TreeCopy, PrototypesAreCopiedThenOverridden) {
+TEST(TreeCopy, PrototypesAreCopiedThenOverriddenUnlessTheyHoldTheNewNodeOrAreGone) {
     auto root = Load(uR"(<Top>
         <Group name="other"/>
         <Group name="proto"><A>1</A><B>#{kind}</B><Group name="sub"><C>c</C></Group>
@@ -82,10 +76,7 @@ TEST(TreeCopy, PrototypesAreCopiedThenOverridden) {
     EXPECT_EQ(TextOf(*ChildOf(*root, u"anchored"), u"A"), u"1");
     EXPECT_EQ(TextOf(*ChildOf(*root, u"lost"), u"A"), u"3");
     EXPECT_TRUE(HasError(*root, u"Unable to find prototype node: nowhere"));
-}
-
-TEST(TreeCopy, APrototypeThatHoldsTheNewNodeIsRefused) {
-    auto root = Load(uR"(<Top>
+    root = Load(uR"(<Top>
         <Group name="outer"><X>1</X>
             <Group name="self" prototype=".."/>
             <Group name="loop" prototype="../loop"/>
@@ -97,10 +88,8 @@ TEST(TreeCopy, APrototypeThatHoldsTheNewNodeIsRefused) {
     EXPECT_TRUE(ChildOf(*outer, u"self")->IsEmpty());
     EXPECT_TRUE(HasError(*outer, u"contains the node being built"));
     EXPECT_NE(ChildOf(*root, u"outer2"), nullptr);
-}
-
-TEST(TreeCopy, AReplacedPrototypeIsNotReadAfterItIsGone) {
-    auto root = Load(uR"(<Top>
+    // A replaced prototype is not read after it is gone.
+    root = Load(uR"(<Top>
         <Group name="a"><Group name="p"><X>1</X></Group></Group>
         <Group name="a" prototype="a/p" replace="yes"><Y>2</Y></Group>
     </Top>)");
@@ -110,7 +99,7 @@ TEST(TreeCopy, AReplacedPrototypeIsNotReadAfterItIsGone) {
     EXPECT_TRUE(HasError(*root, u"Unable to find prototype node: a/p"));
 }
 
-TEST(TreeCopy, VariablesComeFromOpenElementsOutermostFirst) {
+TEST(TreeCopy, VariablesComeFromOpenElementsOutermostFirstAndCopiesStayWithinBudget) {
     auto root = Load(uR"(<Top vendor="outer" board="b1">
         <Group name="g" vendor="inner" rev="2">
             <Text>#{vendor}-#{board}-#{rev}-#{missing}-#{name}-#{document-root}-#{unclosed</Text>
@@ -120,9 +109,6 @@ TEST(TreeCopy, VariablesComeFromOpenElementsOutermostFirst) {
     EXPECT_EQ(TextOf(*ChildOf(*root, u"g"), u"Text"),
               u"outer-b1-2-#{missing}-#{name}-/-#{unclosed");
     EXPECT_EQ(TextOf(*root, u"Sibling"), u"#{rev}");
-}
-
-TEST(TreeCopy, CopiesStayWithinTheEntryBudget) {
     // Each level holds two copies of the level before: without a budget this doubles per line.
     std::u16string doc = u"<Top><Group name='l0'><X>x</X></Group>";
     const auto level = [](int i) {
@@ -143,7 +129,7 @@ TEST(TreeCopy, CopiesStayWithinTheEntryBudget) {
     LoaderSettings settings;
     settings.maxEntries = 10000;
     int32_t result = 0;
-    auto root = Load(doc, &settings, &result);
+    root = Load(doc, &settings, &result);
     EXPECT_EQ(result, static_cast<int32_t>(0x80004005u));
     EXPECT_TRUE(HasError(*root, u"more than 10000 entries"));
 }

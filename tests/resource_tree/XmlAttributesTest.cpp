@@ -18,7 +18,7 @@ std::vector<std::u16string> Keys(const XmlAttributes& atts) {
     return keys;
 }
 
-TEST(XmlAttributes, ASetRefilledAfterClearingShowsOnlyTheNewAttributes) {
+TEST(XmlAttributes, ARefilledSetShowsOnlyTheNewAttributesErasingAndCopyingKeepTheOrder) {
     XmlAttributes atts;
     EXPECT_TRUE(atts.InsertUtf8("Zeta", "last"));
     EXPECT_TRUE(atts.InsertUtf8("alpha", "a long value that needs its own buffer"));
@@ -36,10 +36,7 @@ TEST(XmlAttributes, ASetRefilledAfterClearingShowsOnlyTheNewAttributes) {
     EXPECT_EQ(atts.size(), 1u);
     EXPECT_EQ(Keys(atts), (std::vector<std::u16string>{u"name=\u00E9t\u00E9 \U0001F600"}));
     EXPECT_EQ(atts.Get(u"alpha"), u"");
-}
-
-TEST(XmlAttributes, ErasingAndCopyingKeepTheOrderAndTheCount) {
-    XmlAttributes atts;
+    atts.clear();
     for (const char* name : {"d", "b", "c", "a"})
         atts.Insert(std::u16string(name, name + 1), u"v");
     atts.Erase(u"B");
