@@ -54,7 +54,7 @@ TEST_F(Chain, VisibleAttributesComeOnceAtTheNearestDefinition) {
               wbhw::WriteAttrCluster(u"/A/B/Rate", u"10"));
 }
 
-TEST_F(Chain, PathsResolveFromRootOrRelativeWithOptionalRemainder) {
+TEST_F(Chain, PathsResolveFromRootOrRelativeAndAdoptionNeverLosesOrDuplicatesASet) {
     EXPECT_EQ(b.GetPath(), u"/A/B/");
     EXPECT_EQ(b.ResolvePath(u"/"), &root);
     EXPECT_EQ(root.ResolvePath(u"/a/b/"), &b);
@@ -66,9 +66,6 @@ TEST_F(Chain, PathsResolveFromRootOrRelativeWithOptionalRemainder) {
     EXPECT_EQ(rest, u"X/Y");
     EXPECT_EQ(root.ResolvePath(u"/A/B/", 0, &rest), &b);
     EXPECT_EQ(rest, u"");
-}
-
-TEST_F(Chain, AdoptionNeverLosesOrDuplicatesASet) {
     auto clash = std::make_unique<TIOAttrBag>(u"b");
     auto [existing, inserted] = a.AdoptChild(clash);
     EXPECT_FALSE(inserted);

@@ -18,7 +18,7 @@ std::u16string Write(const TIOAttrBag& bag) {
     return out;
 }
 
-TEST(AttrBagXml, WritesExactLinesWithTrimmedEscapedValues) {
+TEST(AttrBagXml, WritesExactLinesWithTrimmedEscapedValuesAndReadsNestedSets) {
     TIOAttrBag root(u"Item");
     root.SetValue(u"resource", u"  /Conn0/DIO0\n");
     root.SetValue(u"Say \"hi\"", u"a<b & 'c'");
@@ -33,9 +33,6 @@ TEST(AttrBagXml, WritesExactLinesWithTrimmedEscapedValues) {
                            u"   <AttributeSet name=\"Empty\">\n"
                            u"   </AttributeSet>\n"
                            u"</AttributeSet>\n");
-}
-
-TEST(AttrBagXml, ReadsNamesValuesAndNestedSets) {
     TIOAttrBag target(u"old");
     TIOAttrBag* last = nullptr;
     ASSERT_EQ(TIOAttrBag::ReadXml(u"<attributeset NAME='Item'><ATTRIBUTE name='m'><value>\n  on "
@@ -52,7 +49,7 @@ TEST(AttrBagXml, ReadsNamesValuesAndNestedSets) {
     EXPECT_EQ(last, target.ResolvePath(u"/A/B/"));
 }
 
-TEST(AttrBagXml, TopLevelSetWithParentReplacesTheChildOfThatName) {
+TEST(AttrBagXml, TopLevelSetReplacesTheChildOfThatNameUnexpectedDocumentsKeepWhatWasRead) {
     TIOAttrBag target;
     target.GetOrCreateChild(u"A").SetValue(u"old", u"1");
     target.GetOrCreateChild(u"P");
@@ -66,9 +63,6 @@ TEST(AttrBagXml, TopLevelSetWithParentReplacesTheChildOfThatName) {
     EXPECT_EQ(a->FindValue(u"old"), nullptr);
     EXPECT_EQ(a->GetValue(u"new"), u"2");
     EXPECT_EQ(TIOAttrBag::ReadXml(u"<AttributeSet name='x' parent='/Missing'/>", target), kFail);
-}
-
-TEST(AttrBagXml, RejectsUnexpectedDocumentsButKeepsWhatWasRead) {
     for (const char16_t* doc : {
              u"<AttributeSet name='r'><AttributeSet name='S'/><AttributeSet name='s'/>"
              u"</AttributeSet>",                                // duplicate set
@@ -82,15 +76,15 @@ TEST(AttrBagXml, RejectsUnexpectedDocumentsButKeepsWhatWasRead) {
         TIOAttrBag target;
         EXPECT_EQ(TIOAttrBag::ReadXml(doc, target), kFail) << std::string(doc, doc + 20);
     }
-    TIOAttrBag target;
+    TIOAttrBag kept;
     EXPECT_EQ(TIOAttrBag::ReadXml(u"<AttributeSet name='r'><Attribute name='kept'><Value>k"
                                   u"</Value></Attribute><Bad/></AttributeSet>",
-                                  target),
+                                  kept),
               kFail);
-    EXPECT_EQ(target.GetValue(u"kept"), u"k");
+    EXPECT_EQ(kept.GetValue(u"kept"), u"k");
 }
 
-TEST(AttrBagXml, NestingIsBounded) {
+TEST(AttrBagXml, NestingIsBoundedAndOneUnencodableCharacterDoesNotLoseTheBag) {
     auto nested = [](int depth) {
         std::u16string doc;
         for (int i = 0; i < depth; ++i)
@@ -113,9 +107,6 @@ TEST(AttrBagXml, NestingIsBounded) {
     target.WriteXml(written);
     TIOAttrBag again;
     EXPECT_EQ(TIOAttrBag::ReadXml(written, again), 0);
-}
-
-TEST(AttrBagXml, OneUnencodableCharacterDoesNotLoseTheBag) {
     TIOAttrBag bag(u"r");
     bag.SetValue(u"ctl", u"a\x01z");
     bag.SetValue(u"lone", u"x\xDC00y");

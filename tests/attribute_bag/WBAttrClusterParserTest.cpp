@@ -42,7 +42,7 @@ TEST(ClusterXml, WritesThreeCharacterEscapesAndLeavesQuotesAlone) {
     EXPECT_EQ(p.value, u"x & y");
 }
 
-TEST(ClusterXml, ReadsLooseButCorrectLayouts) {
+TEST(ClusterXml, ReadsLooseButCorrectLayoutsAndRejectsBrokenOnes) {
     // Upper-case names and labels, blanks between elements, no cluster Name or NumElts.
     Parsed p = Parse(u"<CLUSTER>\n <STRING><NAME>NAME</NAME><VAL>n</VAL></STRING>\n"
                      u" <string><name>Value</name><val></val></string>\n</CLUSTER>");
@@ -58,9 +58,6 @@ TEST(ClusterXml, ReadsLooseButCorrectLayouts) {
                       u"<String><Name>value</Name><Val>a&amp;b\nc</Val></String>"));
     EXPECT_EQ(p.status, 0);
     EXPECT_EQ(p.value, u"a&b\nc");
-}
-
-TEST(ClusterXml, RejectsBrokenLayouts) {
     for (const std::u16string& text : {
              Cluster(u"<String><Val>x</Val><Name>name</Name></String>"),      // value before label
              Cluster(u"<String><Name> name</Name><Val>x</Val></String>"),     // blank around label

@@ -136,22 +136,6 @@ TEST(ComObject, CountsStayExactUnderConcurrentUse) {
     EXPECT_EQ(qv::com::LiveObjectCount(), before);
 }
 
-TEST(ComPolyObject, StandsAloneWithItsOwnIdentity) {
-    const long before = qv::com::LiveObjectCount();
-    CQVComPolyObject<Sample>* raw = nullptr;
-    ASSERT_EQ(CQVComPolyObject<Sample>::CreateInstance(nullptr, &raw, 4), S_OK);
-    auto poly = ComPtr<IUnknown>::Adopt(raw);
-    auto beta = poly.As<IBeta>();
-    ASSERT_TRUE(beta);
-    EXPECT_EQ(beta->Beta(), 12);
-    EXPECT_EQ(beta.As<IUnknown>().Get(), poly.Get());
-    EXPECT_EQ(CountOf(poly.Get()), 2u);
-    poly.Reset();
-    EXPECT_EQ(beta->Beta(), 12); // the interface keeps the whole object alive
-    beta.Reset();
-    EXPECT_EQ(qv::com::LiveObjectCount(), before);
-}
-
 // An outer object that aggregates a Sample and hands out its IAlpha as its own.
 class Outer : public IBeta {
 public:
@@ -177,11 +161,24 @@ private:
     ComPtr<IUnknown> inner_;
 };
 
-TEST(ComPolyObject, AggregatedInterfacesCountOnTheOuterObject) {
+TEST(ComPolyObject, StandsAloneWithItsOwnIdentityAggregatedCountsOnTheOuterObject) {
     const long before = qv::com::LiveObjectCount();
-    CQVComObject<Outer>* raw = nullptr;
-    ASSERT_EQ(CQVComObject<Outer>::CreateInstance(&raw), S_OK);
-    auto outer = ComPtr<IBeta>::Adopt(raw);
+    CQVComPolyObject<Sample>* raw = nullptr;
+    ASSERT_EQ(CQVComPolyObject<Sample>::CreateInstance(nullptr, &raw, 4), S_OK);
+    auto poly = ComPtr<IUnknown>::Adopt(raw);
+    auto beta = poly.As<IBeta>();
+    ASSERT_TRUE(beta);
+    EXPECT_EQ(beta->Beta(), 12);
+    EXPECT_EQ(beta.As<IUnknown>().Get(), poly.Get());
+    EXPECT_EQ(CountOf(poly.Get()), 2u);
+    poly.Reset();
+    EXPECT_EQ(beta->Beta(), 12); // the interface keeps the whole object alive
+    beta.Reset();
+    EXPECT_EQ(qv::com::LiveObjectCount(), before);
+    // Aggregated, its interfaces count on the outer object.
+    CQVComObject<Outer>* made = nullptr;
+    ASSERT_EQ(CQVComObject<Outer>::CreateInstance(&made), S_OK);
+    auto outer = ComPtr<IBeta>::Adopt(made);
     auto alpha = outer.As<IAlpha>();
     ASSERT_TRUE(alpha);
     EXPECT_EQ(alpha->Alpha(), 2);

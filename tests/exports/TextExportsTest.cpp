@@ -62,7 +62,7 @@ protected:
     }
 };
 
-TEST_F(TextExports, ConvertBothWaysUpToTheFirstNul) {
+TEST_F(TextExports, ConvertBothWaysUpToTheFirstNulAndFailuresAreHostErrors) {
     HostText in(std::string("A\x80\0tail", 7)); // "A", euro sign in windows-1252, NUL
     HostText out("stale");
     ASSERT_EQ(mbstowcs(in.handle(), out.handle()), 0);
@@ -80,24 +80,24 @@ TEST_F(TextExports, ConvertBothWaysUpToTheFirstNul) {
     HostText kanji("\x93\xFA"); // one double-byte character
     ASSERT_EQ(mbstowcs(kanji.handle(), out.handle()), 0);
     EXPECT_EQ(out.bytes(), "\xE5\x65");
-}
-
-TEST_F(TextExports, ConversionFailuresComeBackAsHostErrors) {
-    HostText in("abc");
+    HostText abc("abc");
     // A handle the host does not know cannot be resized: its error code, output untouched.
     int32_t block[2] = {3, 0};
     void* master = block;
-    EXPECT_EQ(mbstowcs(in.handle(), &master), kWBArgErr);
+    EXPECT_EQ(mbstowcs(abc.handle(), &master), kWBArgErr);
     EXPECT_EQ(block[0], 3);
-    EXPECT_EQ(wcstombs(in.handle(), nullptr), kWBArgErr);
+    EXPECT_EQ(wcstombs(abc.handle(), nullptr), kWBArgErr);
     // A code page that cannot be opened is a failure, never an escaping exception.
     UseCodePage("no-such-code-page");
-    HostText out("");
-    EXPECT_NE(mbstowcs(in.handle(), out.handle()), 0);
+    HostText fresh("");
+    EXPECT_NE(mbstowcs(abc.handle(), fresh.handle()), 0);
     EXPECT_EQ(Find("abc", "b"), -1);
 }
 
-TEST_F(TextExports, SearchAnswersTheMatchsByteOffset) {
+TEST_F(TextExports, SearchAnswersByteOffsetsOfMatchesMultibyteRunsAndInvalidCharacters) {
+    EXPECT_EQ(Offsets("plain"), std::make_pair(-1, -1));
+    EXPECT_EQ(Offsets(""), std::make_pair(-1, -1));
+    EXPECT_EQ(Offsets("a\x80"), std::make_pair(-1, -1)); // windows-1252 is single-byte
     EXPECT_EQ(Find("abc", "x"), -1);
     EXPECT_EQ(Find("abc", "ab"), 0);
     EXPECT_EQ(Find("abc", ""), 0);
@@ -110,13 +110,7 @@ TEST_F(TextExports, SearchAnswersTheMatchsByteOffset) {
     EXPECT_EQ(Find("\x81\x98x", "x"), 2);   // section sign: below U+0100 but two bytes
     EXPECT_EQ(Find("\x93\xFA\x96\x7B", "\x96\x7B"), 2);
     EXPECT_EQ(Find("\x93\xFA", "\xFA"), -1); // never a match inside a character
-}
-
-TEST_F(TextExports, FirstRunOfMultibyteCharacters) {
-    EXPECT_EQ(Offsets("plain"), std::make_pair(-1, -1));
-    EXPECT_EQ(Offsets(""), std::make_pair(-1, -1));
-    EXPECT_EQ(Offsets("a\x80"), std::make_pair(-1, -1)); // windows-1252 is single-byte
-    UseCodePage("cp932");
+    // The first run of multibyte characters.
     EXPECT_EQ(Offsets("ab\x93\xFA\x96\x7B"
                       "c"),
               std::make_pair(2, 5));
@@ -124,9 +118,8 @@ TEST_F(TextExports, FirstRunOfMultibyteCharacters) {
                       "a\x96\x7B"),
               std::make_pair(0, 1)); // only the first run
     EXPECT_EQ(Offsets("a\xB1\x93\xFA"), std::make_pair(2, 3));
-}
-
-TEST_F(TextExports, InvalidCharacters) {
+    // Invalid characters, in the default code page.
+    unsetenv("WBTANGIO_CODEPAGE");
     const char* const names = "\\'\"<>|";
     auto check = [&](std::string_view text, const char* set) {
         HostText t(text);

@@ -30,7 +30,7 @@ private:
     int id_;
 };
 
-TEST(CqxItemTypeRegistry, AnyTypeRequestWalksKeyOrderUntilOneCreates) {
+TEST(CqxItemTypeRegistry, AnyTypeRequestWalksKeyOrderUntilOneCreatesOrAnswersTheLastAttempt) {
     std::vector<int> log;
     CqxItemTypeRegistry registry;
     registry.Insert(kHigh, std::make_unique<ScriptedInfo>(S_OK, &log, 3));
@@ -47,21 +47,17 @@ TEST(CqxItemTypeRegistry, AnyTypeRequestWalksKeyOrderUntilOneCreates) {
     EXPECT_EQ(log, (std::vector<int>{2}));
     named.type = ParseGuid("99999999-0000-0000-0000-000000000000");
     EXPECT_EQ(registry.Create(named, &item), CLASS_E_CLASSNOTAVAILABLE);
+    // When none creates, the last attempt is answered.
+    CqxItemTypeRegistry empty;
+    EXPECT_EQ(empty.Create(CqxItemRequest{}, &item), CLASS_E_CLASSNOTAVAILABLE);
+    empty.Insert(kLow, std::make_unique<ScriptedInfo>(E_ACCESSDENIED, &log, 1));
+    empty.Insert(kMid, nullptr); // its information could not be allocated
+    EXPECT_EQ(empty.Create(CqxItemRequest{}, &item), E_OUTOFMEMORY);
+    empty.Insert(kHigh, std::make_unique<ScriptedInfo>(E_ABORT, &log, 3));
+    EXPECT_EQ(empty.Create(CqxItemRequest{}, &item), E_ABORT);
 }
 
-TEST(CqxItemTypeRegistry, WhenNoneCreatesTheLastAttemptIsAnswered) {
-    std::vector<int> log;
-    CqxItemTypeRegistry registry;
-    IUnknown* item = nullptr;
-    EXPECT_EQ(registry.Create(CqxItemRequest{}, &item), CLASS_E_CLASSNOTAVAILABLE);
-    registry.Insert(kLow, std::make_unique<ScriptedInfo>(E_ACCESSDENIED, &log, 1));
-    registry.Insert(kMid, nullptr); // its information could not be allocated
-    EXPECT_EQ(registry.Create(CqxItemRequest{}, &item), E_OUTOFMEMORY);
-    registry.Insert(kHigh, std::make_unique<ScriptedInfo>(E_ABORT, &log, 3));
-    EXPECT_EQ(registry.Create(CqxItemRequest{}, &item), E_ABORT);
-}
-
-TEST(CqxItemTypeRegistry, ListsTypesAndParentTypesInKeyOrder) {
+TEST(CqxItemTypeRegistry, ListsTypesAndParentsInKeyOrderNamedByLiteralsOrStringResources) {
     std::vector<int> log;
     CqxItemTypeRegistry registry;
     registry.Insert(kHigh, std::make_unique<ScriptedInfo>(S_OK, &log, 3));
@@ -77,13 +73,11 @@ TEST(CqxItemTypeRegistry, ListsTypesAndParentTypesInKeyOrder) {
     ASSERT_EQ(parents.size(), 2u);
     EXPECT_TRUE(IsEqualGUID(parents[0], kMid));
     EXPECT_TRUE(IsEqualGUID(parents[1], kCategory));
-}
-
-TEST(CqxItemTypeRegistry, TypeNamesComeFromLiteralsOrStringResources) {
-    CqxItemTypeRegistry registry;
-    registry.SetTypeNameResource(kLow, 0);
-    registry.SetTypeNameLiteral(kLow, u"Tangent IO");
-    registry.SetTypeNameResource(kMid, 42);
+    // Type names come from literals or string resources.
+    CqxItemTypeRegistry names;
+    names.SetTypeNameResource(kLow, 0);
+    names.SetTypeNameLiteral(kLow, u"Tangent IO");
+    names.SetTypeNameResource(kMid, 42);
     const auto load = [](uint32_t id, std::u16string& text) {
         if (id != 42) {
             return false;
@@ -92,16 +86,14 @@ TEST(CqxItemTypeRegistry, TypeNamesComeFromLiteralsOrStringResources) {
         return true;
     };
     BSTR name = nullptr;
-    ASSERT_EQ(registry.TypeName(kLow, load, &name), S_OK);
-    EXPECT_EQ(qv::com::BstrToString(name), u"Tangent IO");
-    SysFreeString(name);
-    ASSERT_EQ(registry.TypeName(kMid, load, &name), S_OK);
-    EXPECT_EQ(qv::com::BstrToString(name), u"forty-two");
-    SysFreeString(name);
-    registry.SetTypeNameResource(kMid, 43);
-    EXPECT_EQ(registry.TypeName(kMid, load, &name), E_FAIL);
+    ASSERT_EQ(names.TypeName(kLow, load, &name), S_OK);
+    EXPECT_EQ(qv::com::UniqueBstr(name).get(), std::u16string_view(u"Tangent IO"));
+    ASSERT_EQ(names.TypeName(kMid, load, &name), S_OK);
+    EXPECT_EQ(qv::com::UniqueBstr(name).get(), std::u16string_view(u"forty-two"));
+    names.SetTypeNameResource(kMid, 43);
+    EXPECT_EQ(names.TypeName(kMid, load, &name), E_FAIL);
     EXPECT_EQ(name, nullptr);
-    EXPECT_EQ(registry.TypeName(kHigh, load, &name), E_FAIL);
+    EXPECT_EQ(names.TypeName(kHigh, load, &name), E_FAIL);
 }
 
 } // namespace

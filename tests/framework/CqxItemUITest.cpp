@@ -44,7 +44,7 @@ template <class T> ComPtr<CQVComObject<T>> Make() {
     return ComPtr<CQVComObject<T>>::Adopt(raw);
 }
 
-TEST(CqxItemUI, AgreesOnlyWithTheProviderThatCreatedIt) {
+TEST(CqxItemUI, AgreesOnlyWithItsProviderAndMenuEntriesCrossAsRecordsWithTexts) {
     const long before = qv::com::LiveObjectCount();
     {
         auto mine = Make<PlainProvider>();
@@ -57,9 +57,6 @@ TEST(CqxItemUI, AgreesOnlyWithTheProviderThatCreatedIt) {
         EXPECT_EQ(item->ValidateAgainst(nullptr), S_FALSE);
     }
     EXPECT_EQ(qv::com::LiveObjectCount(), before); // the item's provider reference was released
-}
-
-TEST(CqxItemUI, MenuEntriesCrossAsRecordsWithTheirTexts) {
     auto item = Make<SampleItem>();
     uint32_t count = 0;
     QxMenuEntry* entries = nullptr;
@@ -75,7 +72,7 @@ TEST(CqxItemUI, MenuEntriesCrossAsRecordsWithTheirTexts) {
     CoTaskMemFree(entries);
 }
 
-TEST(CqxProjectItemUI, OverlaysFollowTheRecordsHandedOver) {
+TEST(CqxProjectItemUI, OverlaysFollowTheRecordsHandedOverAndRenamesRefuseInvalidCharacters) {
     auto item = Make<SampleItem>();
     const auto shown = [&] {
         uint32_t count = 0;
@@ -99,10 +96,7 @@ TEST(CqxProjectItemUI, OverlaysFollowTheRecordsHandedOver) {
     item->Show(false);
     item->UpdateOverlays();
     EXPECT_EQ(shown(), (std::vector<std::u16string>{u"other.png"}));
-}
-
-TEST(CqxProjectItemUI, RenameCheckRefusesTheInvalidCharacters) {
-    auto item = Make<SampleItem>();
+    item = Make<SampleItem>();
     EXPECT_EQ(item->ValidateNewName(u"a|b"), S_OK); // no characters installed yet
     item->ForbidBar();
     EXPECT_EQ(item->ValidateNewName(u"a|b"), S_FALSE);

@@ -73,7 +73,7 @@ TEST(ProviderEntry, ACurrentProviderReleasedMeanwhileIsNeverHandedOut) {
     }
 }
 
-TEST(TIOProvider, ListsItsTypesInGuidOrderAndNamesOnlyTheIOItem) {
+TEST(TIOProvider, ListsItsTypesInGuidOrderAndCreatesItemsAndWizardInTheirInitialState) {
     const auto provider = GetProvider(1);
     uint32_t count = 0;
     GUID* types = nullptr;
@@ -98,9 +98,6 @@ TEST(TIOProvider, ListsItsTypesInGuidOrderAndNamesOnlyTheIOItem) {
     CLSID clsid{};
     ASSERT_EQ(provider->GetClassId(&clsid), S_OK);
     EXPECT_TRUE(IsEqualGUID(clsid, tio::kProviderClassId));
-}
-
-TEST(TIOProvider, CreatesItemsAndWizardInTheirInitialState) {
     const long before = qv::com::LiveObjectCount();
     {
         const auto provider = GetProvider(1);
@@ -139,7 +136,14 @@ TEST(TIOProvider, CreatesItemsAndWizardInTheirInitialState) {
     EXPECT_EQ(qv::com::LiveObjectCount(), before);
 }
 
-TEST(TIOProvider, ValidatesOnlyCandidatesItCreated) {
+// A host project object that counts its references.
+class FakeProject : public IqxProjectItemValidator {
+public:
+    using Interfaces = qv::com::InterfaceList<IqxProjectItemValidator>;
+    HRESULT ValidateAgainst(IUnknown*) override { return S_FALSE; }
+};
+
+TEST(TIOProvider, ValidatesOnlyItsCandidatesAndHoldsOneProjectAtATime) {
     const auto mine = GetProvider(1);
     const auto other = GetProvider(1);
     IUnknown* raw = nullptr;
@@ -149,16 +153,6 @@ TEST(TIOProvider, ValidatesOnlyCandidatesItCreated) {
     EXPECT_EQ(other->ValidateCandidate(item.Get()), S_FALSE);
     EXPECT_EQ(mine->ValidateCandidate(nullptr), S_FALSE);
     EXPECT_EQ(mine->ValidateCandidate(mine.Get()), S_FALSE); // not an item
-}
-
-// A host project object that counts its references.
-class FakeProject : public IqxProjectItemValidator {
-public:
-    using Interfaces = qv::com::InterfaceList<IqxProjectItemValidator>;
-    HRESULT ValidateAgainst(IUnknown*) override { return S_FALSE; }
-};
-
-TEST(TIOProvider, AttachHoldsOneProjectAtATimeAndDetachLetsItGo) {
     const long before = qv::com::LiveObjectCount();
     {
         const auto provider = GetProvider(1);

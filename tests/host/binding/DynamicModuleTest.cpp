@@ -45,7 +45,7 @@ TEST(DynamicModule, StampIsTheBuildIdPrefixAndDiffersBetweenBuilds) {
     EXPECT_EQ(ModuleStamp(nullptr), 1u);
 }
 
-TEST(DynamicModule, ClosedModuleIsNoLongerLoadedAndLookupsKeepNoReference) {
+TEST(DynamicModule, ClosedOrFailedModulesAreNotLoadedAndKeepNoReference) {
     DynamicModule wbrt(hostrt_test::FakeWbrtPath());
     ASSERT_TRUE(wbrt) << wbrt.error();
     void* const handle = wbrt.handle();
@@ -57,9 +57,7 @@ TEST(DynamicModule, ClosedModuleIsNoLongerLoadedAndLookupsKeepNoReference) {
     EXPECT_EQ(LoadedModule("libwbrt.so"), nullptr);
     EXPECT_EQ(ModuleStamp(handle), 1u);
     EXPECT_TRUE(IsModuleLoaded(MainModule()));
-}
-
-TEST(DynamicModule, FailedLoadIsEmptyWithTheLinkersText) {
+    // A failed load is empty, with the linker's text.
     const DynamicModule missing("/nonexistent/libnothing.so");
     EXPECT_FALSE(missing);
     EXPECT_FALSE(missing.error().empty());

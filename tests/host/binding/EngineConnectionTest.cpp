@@ -53,7 +53,7 @@ TEST(WBCIntFunctions, TheNewestValidVersionWrapsATable) {
     EXPECT_EQ(rt::WBCIntFunctions(high.data()).Revision(), 30u);
 }
 
-TEST(EngineConnection, OpensStartsAndClosesThroughTheTable) {
+TEST(EngineConnection, OpensStartsAndClosesThroughTheTableNamedOnesFromRevisionForty) {
     DynamicModule observer(FakePath(4)); // keeps the counters readable after the close
     ASSERT_TRUE(observer);
     rt::EngineConnection connection("8.6", rt::kProcessRuntime);
@@ -68,9 +68,6 @@ TEST(EngineConnection, OpensStartsAndClosesThroughTheTable) {
     EXPECT_EQ(connection.library(), nullptr);
     connection.Close();
     EXPECT_EQ(CountersOf(observer.handle()).closes, 1) << "closing twice closes once";
-}
-
-TEST(EngineConnection, NamedApplicationNeedsRevisionFortyAndAFailureKeepsNothingLoaded) {
     const rt::EngineSearchEnvironment env;
     EXPECT_EQ(rt::OpenEngineConnection(rt::kProcessRuntime, FakePath(1), "Host", env), nullptr);
     EXPECT_EQ(qv::kern::osdep::LoadedModule(FakePath(1).c_str()), nullptr);

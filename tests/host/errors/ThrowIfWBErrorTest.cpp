@@ -71,7 +71,7 @@ TEST(HostErrorToHResult, TableAndEverythingElseAsGeneralFailure) {
     }
 }
 
-TEST(WBErrorException, PrefixHoldsTheCodeInDecimalAndHexWithTheHostsTextOrTheFallback) {
+TEST(WBErrorException, PrefixHoldsTheCodeInDecimalAndHexWithTheHostsTextAndTextFormIsOne) {
     const auto& handles = wbhost::runtime::HandleTable::Instance();
     const size_t liveBefore = handles.LiveCount();
 
@@ -86,9 +86,6 @@ TEST(WBErrorException, PrefixHoldsTheCodeInDecimalAndHexWithTheHostsTextOrTheFal
     const WBErrorException negative(-1);
     EXPECT_EQ(negative.GetErrorCode(), 0xFFFFFFFFu);
     EXPECT_EQ(negative.code(), -1);
-}
-
-TEST(WBErrorException, TextFormCarriesCodeOne) {
     const WBErrorException text("Array index out of bounds.");
     EXPECT_STREQ(text.what(), "Error Code: 1 (00000001): Array index out of bounds.");
     EXPECT_EQ(text.GetErrorCode(), 1u);

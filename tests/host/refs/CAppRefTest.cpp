@@ -141,7 +141,7 @@ TEST_F(RefTest, SetsRunsAndReadsTerminalsThroughOneSharedConnection) {
     EXPECT_EQ(ref->Release(), 0u);
 }
 
-TEST_F(RefTest, TerminalsThatCannotBeSetAndRefsNotOpenedForRunningAreHostErrorOne) {
+TEST_F(RefTest, UnsettableTerminalsAndRefsNotOpenedForRunningFailAndErrorsStayInTheRef) {
     I_GXRef* ref = OpenForRunning();
     int32_t error = 0;
     EXPECT_EQ(ref->SetControlValueByIndex(2, 1.0, &error), E_UNEXPECTED); // not numeric
@@ -158,11 +158,9 @@ TEST_F(RefTest, TerminalsThatCannotBeSetAndRefsNotOpenedForRunningAreHostErrorOn
     EXPECT_EQ(error, 1);
     EXPECT_EQ(engine.runs, 0);
     ref->Release();
-}
-
-TEST_F(RefTest, HostErrorsStayInTheReference) {
-    I_GXRef* ref = reinterpret_cast<I_GXRef*>(8);
-    int32_t error = 0;
+    // Host errors stay in the reference.
+    ref = reinterpret_cast<I_GXRef*>(8);
+    error = 0;
     EXPECT_EQ(app_->OpenProgramRef("missing.gx", 0, 0, 1, &ref, &error), E_UNEXPECTED);
     EXPECT_EQ(error, kWBFileNotFound);
     EXPECT_EQ(ref, nullptr);

@@ -66,7 +66,7 @@ protected:
     ComPtr<CQVComObject<FakeRoot>> root_;
 };
 
-TEST_F(ProgramRunnerTest, AMissingProgramFileFailsWithoutOpening) {
+TEST_F(ProgramRunnerTest, OnlyAnExistingFileIsOpenedAndTheRunnersStatusAnswered) {
     ComPtr<IwbProgram> program;
     ComPtr<IwbProgramRunner> runner;
     EXPECT_EQ(qv::host::runner::OpenHostProgram(root_->GetUnknown(),
@@ -79,13 +79,8 @@ TEST_F(ProgramRunnerTest, AMissingProgramFileFailsWithoutOpening) {
     EXPECT_EQ(
         qv::host::runner::OpenHostProgram(root_->GetUnknown(), u"", program.Put(), runner.Put()),
         E_FAIL);
-}
-
-TEST_F(ProgramRunnerTest, AnExistingFileIsOpenedAndTheRunnersStatusAnswered) {
     const auto path = std::filesystem::temp_directory_path() / "wbt_runner_test.gx";
     std::ofstream(path) << "program\n";
-    ComPtr<IwbProgram> program;
-    ComPtr<IwbProgramRunner> runner;
     const std::string narrow = path.string();
     const std::u16string wide(narrow.begin(), narrow.end());
     EXPECT_EQ(
@@ -96,7 +91,7 @@ TEST_F(ProgramRunnerTest, AnExistingFileIsOpenedAndTheRunnersStatusAnswered) {
     std::filesystem::remove(path);
 }
 
-TEST_F(ProgramRunnerTest, NoRootOrARootWithoutTheServiceHasNoRunner) {
+TEST_F(ProgramRunnerTest, HostReferencesAreReleasedThroughTheRunnerWhichNeedsARootWithTheService) {
     ComPtr<IwbProgram> program;
     ComPtr<IwbProgramRunner> runner;
     // A provider asked before the framework gave it its root object.
@@ -104,9 +99,6 @@ TEST_F(ProgramRunnerTest, NoRootOrARootWithoutTheServiceHasNoRunner) {
               E_POINTER);
     EXPECT_EQ(qv::host::runner::GetProgramRunner(root_->runner->GetUnknown(), runner.Put()),
               E_NOINTERFACE);
-}
-
-TEST_F(ProgramRunnerTest, HostReferencesAreReleasedThroughTheRunner) {
     {
         qv::host::runner::RunnerReference first(root_->runner.Get(), root_->GetUnknown());
         qv::host::runner::RunnerReference none(root_->runner.Get(), nullptr);

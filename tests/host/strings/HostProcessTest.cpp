@@ -23,7 +23,7 @@ TEST(HostProcess, ExecutableExportingTheRuntimeIsTheRuntimeModule) {
     EXPECT_EQ(same.handle(), MainModule()) << "the process already is that runtime";
 }
 
-TEST(HostProcess, HostFunctionsAnswerThroughTheResolver) {
+TEST(HostProcess, HostFunctionsAndTheUserInterfaceLanguageAnswerThroughTheResolver) {
     WBHandle block = rt::DSNewHClr(16);
     ASSERT_NE(block, nullptr);
     EXPECT_EQ(rt::NumericArrayResize(kWBTypeU64, 1, &block, 4), kWBNoErr);
@@ -40,9 +40,6 @@ TEST(HostProcess, HostFunctionsAnswerThroughTheResolver) {
     text = nullptr;
     EXPECT_EQ(rt::GGetOneErrorCode(-77, &text), 0);
     EXPECT_EQ(text, nullptr);
-}
-
-TEST(HostProcess, UserInterfaceLanguageIsAskedOfTheHost) {
     setenv("WBHOST_LANGUAGE", "deu", 1);
     EXPECT_EQ(qv::host::UserInterfaceLanguage(), u"deu");
     setenv("WBHOST_LANGUAGE", "fra", 1);
