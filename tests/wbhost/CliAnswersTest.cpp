@@ -44,7 +44,7 @@ TEST(CliAnswers, RefusesMisspeltBehavioursAndMalformedTextsWithoutSettingAnythin
               ProgramValue(std::u16string(u"\U0001F600")));
 }
 
-TEST(CliAnswers, FilesSkipCommentsAndBlanksAndNameTheBadLine) {
+TEST(CliAnswers, FilesSkipCommentsAndBlanksNameTheBadLineAndSingleAnswersOverrideThem) {
     ScratchFolder scratch;
     const std::string good =
         scratch.Write("good.txt", "# answers for the wizard\r\n\r\n  new-item-wizard:0=0  \r\n"
@@ -72,13 +72,8 @@ TEST(CliAnswers, FilesSkipCommentsAndBlanksAndNameTheBadLine) {
     EXPECT_NE(error.find("it is a folder"), std::string::npos) << error;
     EXPECT_FALSE(LoadAnswerFile("/dev/zero", session, error));
     EXPECT_NE(error.find("not a regular file"), std::string::npos) << error;
-}
-
-TEST(CliAnswers, SingleAnswersOverrideTheFiles) {
-    ScratchFolder scratch;
+    // Single answers override the files.
     const std::string file = scratch.Write("a.txt", "properties:0=1\nproperties:2=5\n");
-    ProgramSession session;
-    std::string error;
     ASSERT_TRUE(ApplyAnswers({file}, {"properties:0=0"}, session, error)) << error;
     EXPECT_EQ(session.AnswersFor("properties").at(0), ProgramValue(0));
     EXPECT_EQ(session.AnswersFor("properties").at(2), ProgramValue(5));

@@ -16,7 +16,7 @@ using wbhost::project::Property;
 
 namespace {
 
-TEST(CliAttributeSet, NewItemSetsReadBackWhateverTheNamesHold) {
+TEST(CliAttributeSet, NewItemSetsReadBackWhateverTheNamesHoldNestedOnesNamedByPath) {
     for (const std::u16string name :
          {u"Valve", u"A/B/C", u"a&b <c> \"d\" 'e'", u"Ventil \u00e4\u20ac"}) {
         const auto read = ReadAttributeSet(NewItemAttributeSet(name, u"Connector0/DIO<1>&"));
@@ -24,9 +24,6 @@ TEST(CliAttributeSet, NewItemSetsReadBackWhateverTheNamesHold) {
         EXPECT_EQ(*read, (std::vector<SetAttribute>{{u"name", name},
                                                     {u"resource", u"Connector0/DIO<1>&"}}));
     }
-}
-
-TEST(CliAttributeSet, NestedSetsAreNamedByTheirPath) {
     const auto read =
         ReadAttributeSet(u"<AttributeSet name=\"\">"
                          u"<Attribute name=\"resource\"><Value>AI0</Value></Attribute>"

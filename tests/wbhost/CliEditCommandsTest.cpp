@@ -29,7 +29,7 @@ protected:
     ScratchProject p;
 };
 
-TEST(CliEditParse, EachActionTakesItsOwnArguments) {
+TEST(CliEditParse, EachActionTakesItsOwnArgumentsAndKeptDescriptionsArePlainFileNames) {
     EditRequest request;
     std::string error;
     ASSERT_TRUE(ParseEdit("rename", {"A/B", "C"}, request, error));
@@ -50,9 +50,7 @@ TEST(CliEditParse, EachActionTakesItsOwnArguments) {
     EXPECT_NE(error.find("rename NODE NEWNAME"), std::string::npos);
     EXPECT_FALSE(ParseEdit("remove", {"A", "B"}, request, error));
     EXPECT_FALSE(ParseEdit("move", {"A", "B"}, request, error));
-}
-
-TEST(CliEditParse, KeptDescriptionNamesArePlainFileNames) {
+    // Kept descriptions are named as plain files beside the project.
     EXPECT_EQ(EditedDescriptionPath("/p/x.wbproj", u"K40"), "/p/x.wbproj.K40.xml");
     EXPECT_EQ(EditedDescriptionPath("x", u"../a b/\u00e9"), "x.___a_b___.xml");
 }

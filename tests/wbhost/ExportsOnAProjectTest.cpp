@@ -1,5 +1,6 @@
 // The module's tree and item exports called as a host program calls them: through dlopen, with
-// refnums, host strings and host arrays, on a real target's tree and real items of a project.
+// refnums, host strings and host arrays, on a real target's tree and real items of a project;
+// the dump export's answer allocated by the host functions of this executable.
 #include "ProjectTestSupport.h"
 #include "cli/HostStringList.h"
 #include "cli/HostText.h"
@@ -35,7 +36,7 @@ constexpr const char* kBoard = R"(<Target>
   <Connector name="C0">
     <Line name="DIO0"><Protocols>IOResource, Digital</Protocols><Speed>slow</Speed></Line>
     <Line name="DIO1"><Protocols>IOResource</Protocols><NameDecoration>Front LED</NameDecoration></Line>
-    <Line name="DIO2"/>
+    <Line name="DIO2"><Note>café</Note></Line>
   </Connector>
 </Target>
 )";
@@ -285,6 +286,39 @@ TEST_F(ExportsOnAProject, AnItemsResourceShowsWithItsDisplayNameAndStatus) {
         EXPECT_EQ(HostStringBytes(shown.get()), c.shown) << c.resource;
         EXPECT_EQ(status, c.status) << c.resource;
     }
+}
+
+TEST_F(ExportsOnAProject, DumpsTheNodeInTheHostsCodePageAndBadArgumentsAnswerFailures) {
+    auto* dump = Export<DumpFn>("TIOResTree_Dump");
+    const auto text = NewHostString("old");
+    uint8_t found = 7;
+    EXPECT_EQ(dump(&tree, NewHostString("C0/DIO9").get(), text.get(), &found), S_OK);
+    EXPECT_EQ(found, 0);
+    EXPECT_EQ(HostStringBytes(text.get()), "old");
+    ASSERT_EQ(dump(&tree, NewHostString("C0/DIO2").get(), text.get(), &found), S_OK);
+    EXPECT_EQ(found, 1);
+    // "\xE9" is e-acute in the default single-byte code page.
+    EXPECT_EQ(HostStringBytes(text.get()),
+              "<Line name=\"DIO2\">\n  <Note>caf\xE9</Note>\n</Line>\n");
+
+    const auto path = NewHostString("");
+    const WBRefNum unknown = 0xFFFFFFF0u;
+    EXPECT_EQ(dump(&unknown, path.get(), text.get(), &found), E_INVALIDARG);
+    EXPECT_EQ(found, 0);
+    EXPECT_EQ(dump(nullptr, path.get(), text.get(), &found), E_POINTER);
+    EXPECT_EQ(dump(&tree, path.get(), text.get(), nullptr), E_POINTER);
+    EXPECT_EQ(dump(&tree, path.get(), nullptr, &found), E_POINTER);
+    EXPECT_EQ(HostStringBytes(text.get()),
+              "<Line name=\"DIO2\">\n  <Note>caf\xE9</Note>\n</Line>\n");
+    // A handle the host never made cannot be written: its host error comes back as a status,
+    // with the node already found.
+    void* notAHostBlock = nullptr;
+    EXPECT_EQ(dump(&tree, path.get(), &notAHostBlock, &found), E_INVALIDARG);
+    EXPECT_EQ(found, 1);
+    // A null path handle reads as the empty path: the root.
+    EXPECT_EQ(dump(&tree, nullptr, text.get(), &found), S_OK);
+    EXPECT_EQ(found, 1);
+    EXPECT_EQ(HostStringBytes(text.get()).substr(0, 8), "<Target ");
 }
 
 TEST_F(ExportsOnAProject, TheProviderExportHandsOutTheProviderTheSessionWorksWith) {

@@ -42,26 +42,14 @@ std::vector<std::string> FilesIn(const std::string& folder) {
 }
 
 void SetMark(Project& project, const char16_t* value) {
-    IwbProjectPropertyBag* bag = nullptr;
-    project.Root().GetPropertyBag(&bag);
-    bag->SetString(u"mark", value, 0);
-    bag->Release();
+    project.Root().Bag().SetString(u"mark", value, 0);
 }
 
 std::u16string MarkOf(const std::string& path, wbhost::resources::ResourceService& service) {
     std::string error;
     auto project = Project::Open(path, service, &error);
     EXPECT_TRUE(project) << error;
-    if (!project)
-        return {};
-    IwbProjectPropertyBag* bag = nullptr;
-    project->Root().GetPropertyBag(&bag);
-    BSTR text = nullptr;
-    bag->GetString(u"mark", &text);
-    std::u16string mark = qv::com::BstrToString(text);
-    SysFreeString(text);
-    bag->Release();
-    return mark;
+    return project ? StringOf(project->Root().Bag(), u"mark") : u"";
 }
 
 class ProjectFormatTest : public ::testing::Test {
@@ -109,13 +97,9 @@ TEST_F(ProjectFormatTest, EverythingReadsBackUnchanged) {
             ComPtr<IUnknown>& object) -> HRESULT {
             EXPECT_TRUE(qv::com::QueryAs<IwbProjectPropertyBag>(state)); // reloaded, not new
             EXPECT_TRUE(IsEqualGUID(type, kItemType));
-            IwbProjectPropertyBag* madeBag = nullptr;
-            made.GetPropertyBag(&madeBag);
-            BSTR text = nullptr;
-            madeBag->GetString(u"text h", &text);
-            seenAtCreation.push_back(qv::com::BstrToString(text));
-            SysFreeString(text);
-            madeBag->Release();
+            ComPtr<IwbProjectPropertyBag> madeBag;
+            made.GetPropertyBag(madeBag.Put());
+            seenAtCreation.push_back(StringOf(*madeBag.Get(), u"text h"));
             object = ComPtr<IUnknown>::Share(Make<ScopeObjectImpl>()->GetUnknown());
             return S_OK;
         });
@@ -145,13 +129,10 @@ TEST_F(ProjectFormatTest, EverythingReadsBackUnchanged) {
     EXPECT_NE(reItem.Object(), nullptr);
     IwbProjectPropertyBag* reBag = nullptr;
     const_cast<ProjectItem&>(reItem).GetPropertyBag(&reBag);
-    for (size_t i = 0; i < texts.size(); ++i) {
-        const std::u16string name = u"text " + std::u16string(1, char16_t(u'a' + i));
-        BSTR text = nullptr;
-        EXPECT_EQ(reBag->GetString(name.c_str(), &text), S_OK);
-        EXPECT_EQ(qv::com::BstrToString(text), texts[i]) << i;
-        SysFreeString(text);
-    }
+    for (size_t i = 0; i < texts.size(); ++i)
+        EXPECT_EQ(StringOf(*reBag, (u"text " + std::u16string(1, char16_t(u'a' + i))).c_str()),
+                  texts[i])
+            << i;
     int32_t value = 0;
     EXPECT_EQ(reBag->GetBool(u"no", &value), S_OK); // a false Boolean is still present
     EXPECT_EQ(value, 0);

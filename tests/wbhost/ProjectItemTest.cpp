@@ -138,9 +138,7 @@ TEST_F(ProjectItemTest, PropertiesAreTypedAndAbsentAnswersFalse) {
     EXPECT_EQ(bag->GetInt(u"N", &number), S_FALSE);
     EXPECT_EQ(bag->GetString(u"n", &text), E_INVALIDARG);
     bag->SetString(u"n", u"now text", 0);
-    EXPECT_EQ(bag->GetString(u"n", &text), S_OK);
-    EXPECT_EQ(qv::com::BstrToString(text), u"now text");
-    SysFreeString(text);
+    EXPECT_EQ(StringOf(*bag, u"n"), u"now text");
     bag->Release();
 }
 

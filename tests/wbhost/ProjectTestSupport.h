@@ -108,6 +108,13 @@ inline std::u16string NameOf(IwbProjectItem* item) {
 
 using test::TakeText;
 
+// The string NAME of BAG, which must hold one.
+inline std::u16string StringOf(IwbProjectPropertyBag& bag, const char16_t* name) {
+    BSTR text = nullptr;
+    EXPECT_EQ(bag.GetString(name, &text), S_OK) << qv::kern::WideToUtf8(name);
+    return TakeText(text);
+}
+
 // A session with the build's module and a new project "P" whose target "T" is made from the
 // board text the test names; items are made through the project as the host's tree makes them.
 class ModuleProjectTest : public ::testing::Test {
@@ -190,9 +197,7 @@ protected:
     // The status the item stored with its properties.
     static int32_t Status(ProjectItem* item) { return Int(item, u"tioResourceStatus"); }
     static std::u16string StoredBag(ProjectItem* item) {
-        BSTR text = nullptr;
-        item->Bag().GetString(u"tioAttrBag", &text);
-        return TakeText(text);
+        return StringOf(item->Bag(), u"tioAttrBag");
     }
     static std::u16string Resource(ProjectItem* item) {
         BSTR path = nullptr;

@@ -11,7 +11,7 @@ namespace {
 
 using wbhost::runtime::RefnumTable;
 
-TEST(RefnumTable, RefnumsLeadToTheirObjectsUntilRemoved) {
+TEST(RefnumTable, RefnumsLeadToTheirObjectsUntilRemovedUnknownOnesAreFailures) {
     auto observer = test::NewObserver();
     RefnumTable& table = RefnumTable::Instance();
     const WBRefNum refnum = table.Add(observer.Get());
@@ -37,11 +37,9 @@ TEST(RefnumTable, RefnumsLeadToTheirObjectsUntilRemoved) {
     // Only this test's own reference is left.
     EXPECT_EQ(observer->AddRef(), 2u);
     observer->Release();
-}
-
-TEST(RefnumTable, UnknownRefnumsAndUnalignedIdentifiersAreFailuresNeverCrashes) {
+    // Unknown refnums and unaligned identifiers are failures, never crashes.
     const WBRefNum unknown = 0xDEADBEEFu;
-    void* object = &object;
+    object = &object;
     EXPECT_EQ(QueryInterfaceForWBRefNum(&unknown, &IUnknown::iid, &object), E_INVALIDARG);
     EXPECT_EQ(object, nullptr);
     // An identifier need not be aligned as a GUID is.

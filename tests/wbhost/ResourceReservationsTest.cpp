@@ -41,7 +41,7 @@ protected:
     ComPtr<IwbhwResourceTreeNode> line_;
 };
 
-TEST_F(ReservationTest, TheFirstItemHoldsItAndTheNextInLineTakesOver) {
+TEST_F(ReservationTest, TheFirstItemHoldsItTheNextTakesOverOnlySharedModeNoNulls) {
     const auto first = test::NewItem();
     const auto second = test::NewItem();
     auto observer = test::NewObserver();
@@ -66,9 +66,6 @@ TEST_F(ReservationTest, TheFirstItemHoldsItAndTheNextInLineTakesOver) {
     EXPECT_EQ(observer->heard.back().events, 0x40u);
     EXPECT_EQ(line_->ReleaseReservation(second.Get()), S_OK);
     EXPECT_EQ(IsReserved(nullptr), 0u);
-}
-
-TEST_F(ReservationTest, OnlySharedModeIsKnownAndNullsAreRefused) {
     const auto item = test::NewItem();
     EXPECT_EQ(line_->Reserve(item.Get(), 1), E_NOTIMPL);
     EXPECT_EQ(line_->Reserve(nullptr, 3), E_POINTER);

@@ -54,9 +54,7 @@ protected:
 std::u16string ReadString(IwbProgram* program, uint32_t index) {
     BSTR text = nullptr;
     EXPECT_EQ(program->GetOutputString(index, &text), S_OK);
-    std::u16string result = qv::com::BstrToString(text);
-    SysFreeString(text);
-    return result;
+    return test::TakeText(text);
 }
 
 std::vector<std::u16string> ReadList(IwbProgram* program, uint32_t index) {

@@ -19,7 +19,7 @@ using varianttext::GetText;
 using varianttext::Name;
 using varianttext::SetText;
 
-TEST(RuntimeVariant, NestedAttributesReadAsCopiesOfTheirOwn) {
+TEST(RuntimeVariant, OneNameOneAttributeOfAnyKindNestedOnesReadAsCopies) {
     const size_t live = wbhost::runtime::VariantTable::Instance().LiveCount();
     WBVariant data = WbVariantCreate();
     WBVariant tdData = WbVariantCreate();
@@ -43,9 +43,7 @@ TEST(RuntimeVariant, NestedAttributesReadAsCopiesOfTheirOwn) {
     EXPECT_EQ(WbVariantDestroy(again), kWBNoErr);
     EXPECT_EQ(WbVariantDestroy(data), kWBNoErr);
     EXPECT_EQ(wbhost::runtime::VariantTable::Instance().LiveCount(), live);
-}
-
-TEST(RuntimeVariant, OneNameOneAttributeOfAnyKind) {
+    // One name holds one attribute of any kind.
     WBVariant element = WbVariantCreate();
     ASSERT_EQ(SetText(element, "n", "Connector0/DIO0"), kWBNoErr);
     // A string is read into a host string of the caller's, which grows to fit.

@@ -22,7 +22,7 @@ std::vector<std::u16string> List(IwbhwTargetResources& hardware, const char16_t*
     return list;
 }
 
-TEST(TargetHardware, ListsTheNodesOfTheInterfaceThatPassTheFilter) {
+TEST(TargetHardware, ListsTheNodesOfTheInterfaceThatPassAFilterOfKeysListsIgnoringUnknownKeys) {
     wbhost::resources::ResourceService service;
     const auto* target = service.LoadTargetText(uR"(<Target>
       <Line name="DIO0"><IOInterface>DigitalLine</IOInterface><Protocols>IOResource</Protocols></Line>
@@ -43,9 +43,7 @@ TEST(TargetHardware, ListsTheNodesOfTheInterfaceThatPassTheFilter) {
     EXPECT_TRUE(List(hardware, u"Counter", standard).empty());
     BSTR* names = nullptr;
     EXPECT_EQ(hardware.ListResourceNames(u"", standard, &names, nullptr), E_POINTER);
-}
-
-TEST(ProtocolFilter, ContinuesAKeysListAndIgnoresUnknownKeys) {
+    // The filter continues a keys list and ignores unknown keys.
     using wbhost::resources::ProtocolFilter;
     const auto filter =
         ProtocolFilter::Parse(u"include_protocols=A,B,colour=red,exclude_protocols=C");
