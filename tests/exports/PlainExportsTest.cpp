@@ -1,6 +1,6 @@
 // The exports that take plain C values (GetInfo, TIO_CompareTwoResourceTrees), called through the
 // loaded module as a host calls them.
-#include "LoadedModule.h"
+#include "cli/HostedModule.h"
 
 #include <cstdint>
 #include <gtest/gtest.h>
@@ -10,20 +10,14 @@ namespace {
 
 using CompareFn = uint32_t(const char*, const char*);
 
-TEST(InfoExport, AnswersFiveEveryTime) {
-    test::LoadedModule module;
-    ASSERT_TRUE(module.Loaded()) << test::LoadedModule::LoadError();
+TEST(PlainExports, InfoAnswersFiveCompareTheThreeCodesTakingNullAsEmptyInTheDefaultCodePage) {
+    const wbhost::cli::HostedModule module{WBT_MODULE_PATH};
+    ASSERT_TRUE(module.Loaded()) << module.Error();
     auto* getInfo = module.Find<int32_t()>("GetInfo");
-    ASSERT_NE(getInfo, nullptr);
-    EXPECT_EQ(getInfo(), 5);
-    EXPECT_EQ(getInfo(), 5);
-}
-
-TEST(CompareExport, AnswersTheThreeCodesTakesNullAsEmptyAndReadsTheDefaultCodePage) {
-    test::LoadedModule module;
-    ASSERT_TRUE(module.Loaded()) << test::LoadedModule::LoadError();
     auto* compare = module.Find<CompareFn>("TIO_CompareTwoResourceTrees");
-    ASSERT_NE(compare, nullptr);
+    ASSERT_TRUE(getInfo && compare);
+    EXPECT_EQ(getInfo(), 5);
+    EXPECT_EQ(getInfo(), 5);
 
     const std::string required = "<IOResource><Direction>Input</Direction></IOResource>";
     const std::string offered =

@@ -1,7 +1,7 @@
 // The exports through which a host names its runtime, called as a host calls them: the module's
 // host calls then bind in the module (or the thread's module) that the host named.
-#include "LoadedModule.h"
-#include "runtime/HostStrings.h"
+#include "cli/HostText.h"
+#include "cli/HostedModule.h"
 #include "runtime/Runtime.h"
 
 #include <cstdint>
@@ -19,20 +19,15 @@ using MbsToWcs = int32_t(WBHandle, WBHandle);
 
 // Converts "A" through the module, which writes the result with the host's NumericArrayResize.
 int32_t ConvertOnce(MbsToWcs* mbstowcs) {
-    WBHandle in = nullptr;
-    WBHandle out = nullptr;
-    wbhost::runtime::StoreHostString(&in, "A");
-    wbhost::runtime::StoreHostString(&out, "");
-    const int32_t status = mbstowcs(in, out);
-    const std::string written = wbhost::runtime::ReadHostString(out).value_or("<bad>");
-    DSDisposeHandle(in);
-    DSDisposeHandle(out);
-    return status == 0 && written == std::string("A\0", 2) ? 0 : -1;
+    const auto in = wbhost::cli::NewHostString("A");
+    const auto out = wbhost::cli::NewHostString("");
+    const int32_t status = mbstowcs(in.get(), out.get());
+    return status == 0 && wbhost::cli::HostStringBytes(out.get()) == std::string("A\0", 2) ? 0 : -1;
 }
 
 TEST(RuntimeExports, TheNamedModuleOrTheThreadsOwnServesTheModulesHostCalls) {
-    test::LoadedModule module;
-    ASSERT_TRUE(module.Loaded()) << test::LoadedModule::LoadError();
+    const wbhost::cli::HostedModule module{WBT_MODULE_PATH};
+    ASSERT_TRUE(module.Loaded()) << module.Error();
     auto* setModule = module.Find<SetModule>("SetWBRTModule");
     auto* setTlsIndex = module.Find<SetTlsIndex>("SetWBRTTLSIndex");
     auto* moduleHook = module.Find<Hook>("SetWBRTModuleHook");

@@ -1,7 +1,7 @@
 // The text helpers, called through the loaded module with host strings that the embedded host's
 // runtime allocates, as a host program hands them over.
-#include "LoadedModule.h"
-#include "runtime/HostStrings.h"
+#include "cli/HostText.h"
+#include "cli/HostedModule.h"
 #include "runtime/Runtime.h"
 
 #include <cstdint>
@@ -11,27 +11,12 @@
 
 namespace {
 
+using wbhost::cli::HostStringBytes;
+using wbhost::cli::NewHostString;
 using MbsToWcs = int32_t(WBHandle, WBHandle);
 using WcsWcs = int32_t(WBHandle, WBHandle);
 using McbOffsets = void(WBHandle, int32_t*, int32_t*);
 using IsInvalidChar = uint8_t(WBHandle, const char*);
-
-// A host string owned by the test, made and resized by the host runtime.
-class HostText {
-public:
-    explicit HostText(std::string_view bytes) {
-        EXPECT_EQ(wbhost::runtime::StoreHostString(&handle_, bytes), kWBNoErr);
-    }
-    ~HostText() { DSDisposeHandle(handle_); }
-    HostText(const HostText&) = delete;
-    HostText& operator=(const HostText&) = delete;
-
-    WBHandle handle() const { return handle_; }
-    std::string bytes() const { return wbhost::runtime::ReadHostString(handle_).value_or("<bad>"); }
-
-private:
-    WBHandle handle_ = nullptr;
-};
 
 // Runs each test with a chosen default code page, and the module loaded.
 class TextExports : public ::testing::Test {
@@ -39,7 +24,7 @@ protected:
     void TearDown() override { unsetenv("WBTANGIO_CODEPAGE"); }
     static void UseCodePage(const char* name) { setenv("WBTANGIO_CODEPAGE", name, 1); }
 
-    test::LoadedModule module;
+    wbhost::cli::HostedModule module{WBT_MODULE_PATH};
     MbsToWcs* mbstowcs = module.Find<MbsToWcs>("TIO_mbstowcs");
     MbsToWcs* wcstombs = module.Find<MbsToWcs>("TIO_wcstombs");
     WcsWcs* wcswcs = module.Find<WcsWcs>("TIO_wcswcs");
@@ -47,50 +32,52 @@ protected:
     IsInvalidChar* isInvalid = module.Find<IsInvalidChar>("TIOCommon_IsInvalidChar");
 
     void SetUp() override {
-        ASSERT_TRUE(module.Loaded()) << test::LoadedModule::LoadError();
+        ASSERT_TRUE(module.Loaded()) << module.Error();
         ASSERT_TRUE(mbstowcs && wcstombs && wcswcs && mbcOffsets && isInvalid);
     }
     int32_t Find(std::string_view haystack, std::string_view needle) {
-        HostText h(haystack), n(needle);
-        return wcswcs(h.handle(), n.handle());
+        const auto h = NewHostString(haystack), n = NewHostString(needle);
+        return wcswcs(h.get(), n.get());
     }
     std::pair<int32_t, int32_t> Offsets(std::string_view text) {
-        HostText t(text);
+        const auto t = NewHostString(text);
         int32_t first = 7, last = 7;
-        mbcOffsets(t.handle(), &first, &last);
+        mbcOffsets(t.get(), &first, &last);
         return {first, last};
     }
 };
 
 TEST_F(TextExports, ConvertBothWaysUpToTheFirstNulAndFailuresAreHostErrors) {
-    HostText in(std::string("A\x80\0tail", 7)); // "A", euro sign in windows-1252, NUL
-    HostText out("stale");
-    ASSERT_EQ(mbstowcs(in.handle(), out.handle()), 0);
-    EXPECT_EQ(out.bytes(), std::string("A\0\xAC\x20", 4));
+    const auto in =
+        NewHostString(std::string_view("A\x80\0tail", 7)); // "A", euro sign in windows-1252, NUL
+    const auto out = NewHostString("stale");
+    ASSERT_EQ(mbstowcs(in.get(), out.get()), 0);
+    EXPECT_EQ(HostStringBytes(out.get()), std::string("A\0\xAC\x20", 4));
 
-    HostText wide(std::string("A\0\xAC\x20\0\0B\0\x01", 9)); // odd last byte ignored
-    ASSERT_EQ(wcstombs(wide.handle(), out.handle()), 0);
-    EXPECT_EQ(out.bytes(), "A\x80");
+    const auto wide =
+        NewHostString(std::string_view("A\0\xAC\x20\0\0B\0\x01", 9)); // odd last byte ignored
+    ASSERT_EQ(wcstombs(wide.get(), out.get()), 0);
+    EXPECT_EQ(HostStringBytes(out.get()), "A\x80");
 
-    HostText empty("");
-    ASSERT_EQ(mbstowcs(empty.handle(), out.handle()), 0);
-    EXPECT_EQ(out.bytes(), "");
+    const auto empty = NewHostString("");
+    ASSERT_EQ(mbstowcs(empty.get(), out.get()), 0);
+    EXPECT_EQ(HostStringBytes(out.get()), "");
 
     UseCodePage("cp932");
-    HostText kanji("\x93\xFA"); // one double-byte character
-    ASSERT_EQ(mbstowcs(kanji.handle(), out.handle()), 0);
-    EXPECT_EQ(out.bytes(), "\xE5\x65");
-    HostText abc("abc");
+    const auto kanji = NewHostString("\x93\xFA"); // one double-byte character
+    ASSERT_EQ(mbstowcs(kanji.get(), out.get()), 0);
+    EXPECT_EQ(HostStringBytes(out.get()), "\xE5\x65");
+    const auto abc = NewHostString("abc");
     // A handle the host does not know cannot be resized: its error code, output untouched.
     int32_t block[2] = {3, 0};
     void* master = block;
-    EXPECT_EQ(mbstowcs(abc.handle(), &master), kWBArgErr);
+    EXPECT_EQ(mbstowcs(abc.get(), &master), kWBArgErr);
     EXPECT_EQ(block[0], 3);
-    EXPECT_EQ(wcstombs(abc.handle(), nullptr), kWBArgErr);
+    EXPECT_EQ(wcstombs(abc.get(), nullptr), kWBArgErr);
     // A code page that cannot be opened is a failure, never an escaping exception.
     UseCodePage("no-such-code-page");
-    HostText fresh("");
-    EXPECT_NE(mbstowcs(abc.handle(), fresh.handle()), 0);
+    const auto fresh = NewHostString("");
+    EXPECT_NE(mbstowcs(abc.get(), fresh.get()), 0);
     EXPECT_EQ(Find("abc", "b"), -1);
 }
 
@@ -122,8 +109,8 @@ TEST_F(TextExports, SearchAnswersByteOffsetsOfMatchesMultibyteRunsAndInvalidChar
     unsetenv("WBTANGIO_CODEPAGE");
     const char* const names = "\\'\"<>|";
     auto check = [&](std::string_view text, const char* set) {
-        HostText t(text);
-        return isInvalid(t.handle(), set);
+        const auto t = NewHostString(text);
+        return isInvalid(t.get(), set);
     };
     EXPECT_EQ(check("a\tb", ""), 1);
     EXPECT_EQ(check("plain name", ""), 0);

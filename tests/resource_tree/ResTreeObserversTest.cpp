@@ -101,7 +101,7 @@ TEST(ResTreeObservers, ObserversLeavingOrJoiningDuringAPass) {
     EXPECT_EQ(joiner.calls[1].cookie, 4u);
 }
 
-TEST(ResTreeObservers, ChangesRaisedDuringDeliveryGoOutInAFurtherPass) {
+TEST(ResTreeObservers, ChangesRaisedDuringDeliveryGoOutInAFurtherPassAWholeLoadInOne) {
     ResTreeNode node(u"", u"Target", false);
     Recorder recorder;
     recorder.during = [&] {
@@ -113,15 +113,13 @@ TEST(ResTreeObservers, ChangesRaisedDuringDeliveryGoOutInAFurtherPass) {
     ASSERT_EQ(recorder.calls.size(), 2u);
     EXPECT_EQ(recorder.calls[0].changes, kChildAdded);
     EXPECT_EQ(recorder.calls[1].changes, kValueAdded);
-}
-
-TEST(ResTreeObservers, AWholeLoadIsOneDelivery) {
+    // A whole load is one delivery.
     ResTreeNode root(u"", u"", false);
-    Recorder recorder;
-    root.AddObserver(&recorder, kAllChanges, 0);
+    Recorder onLoad;
+    root.AddObserver(&onLoad, kAllChanges, 0);
     EXPECT_EQ(root.ParseText(u"<Top><A/><B/><M name='m'/></Top>", false), 0);
-    ASSERT_EQ(recorder.calls.size(), 1u);
-    EXPECT_EQ(recorder.calls[0].changes, kValueAdded | kChildAdded);
+    ASSERT_EQ(onLoad.calls.size(), 1u);
+    EXPECT_EQ(onLoad.calls[0].changes, kValueAdded | kChildAdded);
 }
 
 TEST(ResTreeObservers, AncestorAndReservationChangesAreForwarded) {

@@ -38,7 +38,7 @@ std::string ReadFile(const std::string& path) {
     return bytes.str();
 }
 
-TEST(ResTreeWriter, LoadedDocumentsRoundTrip) {
+TEST(ResTreeWriter, LoadedDocumentsRoundTripAndWhatCannotComeBackIsFlagged) {
     const char* source = std::getenv("WBT_SOURCE_DIR");
     const std::string dir =
         std::string(source != nullptr ? source : ".") + "/tests/resource_tree/data";
@@ -65,9 +65,7 @@ TEST(ResTreeWriter, LoadedDocumentsRoundTrip) {
         auto again = Load(written.xml);
         EXPECT_EQ(WriteResTree(*again, u"eng").xml, written.xml);
     }
-}
-
-TEST(ResTreeWriter, WhatCannotComeBackIsFlagged) {
+    // What cannot come back is flagged.
     auto check = [](auto build) {
         ResTreeNode root(u"r", u"Top", false);
         build(root);

@@ -24,15 +24,13 @@ std::string Resource(const std::string& body) {
     return "<IOResource>" + body + "</IOResource>";
 }
 
-TEST(ResourceCompare, EmptyTextsDecideWithoutLoadingAndBrokenDocumentsStillCompare) {
+TEST(ResourceCompare, EmptyTextsBrokenDocumentsEmptyListsAndLocalizedEntriesAreMended) {
     EXPECT_EQ(Compare("", ""), kMatch);
     EXPECT_EQ(Compare("", Resource("")), kToleratedDifference);
     EXPECT_EQ(Compare(Resource(""), ""), kNotSatisfied);
     EXPECT_EQ(Compare(Resource("<A>1</A>"), "<IOResource><A>1</A>"), kToleratedDifference);
     EXPECT_EQ(Compare("<IOResource><A>1</A>", "<IOResource><A>1</A>"), kMatch);
-}
-
-TEST(ResourceCompare, AnEmptyListAsksForNothing) {
+    // An empty list asks for nothing.
     const auto sv = [](const std::string& list) {
         return Resource("<SupportedValues>" + list + "</SupportedValues>");
     };
@@ -40,9 +38,7 @@ TEST(ResourceCompare, AnEmptyListAsksForNothing) {
     EXPECT_EQ(Compare(sv(""), sv("")), kMatch);
     EXPECT_EQ(Compare(sv("1,2"), sv("")), kNotSatisfied);
     EXPECT_EQ(Compare(sv(","), sv("")), kNotSatisfied) << "two empty pieces are still asked for";
-}
-
-TEST(ResourceCompare, LocalizedEntriesTakeNoPartInOrderedPairing) {
+    // Localized entries take no part in ordered pairing.
     const auto steps = [](const std::string& body) {
         return Resource("<Steps name='Steps' ordered='true'>" + body + "</Steps>");
     };

@@ -17,7 +17,7 @@ using qv::kern::osdep::GetModuleDirectory;
 using qv::kern::osdep::GetModuleDirectoryOf;
 using qv::kern::osdep::WinError;
 
-TEST(OsPath, ExecutableAndItsDirectory) {
+TEST(OsPath, DirectoryOfTheExecutableAndOfASharedLibrary) {
     const std::string exe = GetExePath();
     EXPECT_EQ(fs::path(exe).filename(), "kern_tests");
     EXPECT_TRUE(fs::path(exe).is_absolute());
@@ -25,9 +25,6 @@ TEST(OsPath, ExecutableAndItsDirectory) {
     EXPECT_EQ(GetModuleDirectory(nullptr), dir);
     EXPECT_EQ(GetModuleDirectory(dlopen(nullptr, RTLD_NOW)), dir);
     EXPECT_EQ(GetModuleDirectoryOf(reinterpret_cast<const void*>(&GetExePath)), dir);
-}
-
-TEST(OsPath, DirectoryOfASharedLibrary) {
     Dl_info info{};
     ASSERT_NE(dladdr(reinterpret_cast<const void*>(&ucol_open), &info), 0);
     const std::string expected =
@@ -67,7 +64,7 @@ protected:
     fs::path dir_;
 };
 
-TEST_F(FindFilesTest, WildcardsMatchTheLastComponent) {
+TEST_F(FindFilesTest, WildcardsMatchTheLastComponentAndNothingFoundIsAnEmptyList) {
     EXPECT_EQ(FindFiles(In("*.gx")),
               (std::vector<std::string>{Dir() + ".hidden.gx", Dir() + "[x].gx", Dir() + "a.gx",
                                         Dir() + "sub.gx"}));
@@ -75,9 +72,6 @@ TEST_F(FindFilesTest, WildcardsMatchTheLastComponent) {
     EXPECT_EQ(FindFiles(In("[x].gx")), (std::vector<std::string>{Dir() + "[x].gx"}));
     EXPECT_EQ(FindFiles(In("*.*")).size(), 7u);
     EXPECT_EQ(FindFiles(In("noext")), (std::vector<std::string>{Dir() + "noext"}));
-}
-
-TEST_F(FindFilesTest, NothingFoundIsAnEmptyList) {
     EXPECT_TRUE(FindFiles(In("*.none")).empty());
     EXPECT_TRUE(FindFiles(In("missing/*.gx")).empty());
     EXPECT_TRUE(FindFiles(In("a.gx/*")).empty());
