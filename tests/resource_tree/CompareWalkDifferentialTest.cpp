@@ -193,7 +193,7 @@ TEST(CompareWalkDifferential, AgreesWithTheRulesReadLiterally) {
     dir.Write("d2.xml", "<X ordered='true'><Pin>1</Pin><Pin>2</Pin></X>");
     LoaderSettings settings = DefaultLoaderSettings();
     const LoaderSettings saved = settings;
-    settings.deferredDirectory = dir.path();
+    settings.deferredDirectory = dir.Path();
     SetDefaultLoaderSettings(settings);
 
     std::mt19937 rng(14);

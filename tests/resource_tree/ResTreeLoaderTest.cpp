@@ -51,9 +51,9 @@ TEST(ResTreeLoader, FilesLoadAlikeWhereverTheBlocksEndAndTheirErrorsNameThem) {
     EXPECT_EQ(TextOf(*ChildOf(*grown, u"R149"), u"Label"), u"\u00E9t\u00E9 149");
     // Errors name the file.
     root = NewRoot();
-    EXPECT_EQ(root->ParseFile(dir.path() + "/missing.xml", false), kFail);
+    EXPECT_EQ(root->ParseFile(dir.Path() + "/missing.xml", false), kFail);
     EXPECT_EQ(root->Find(u"XMLParseErrors"), root->End());
-    EXPECT_EQ(root->ParseFile(dir.path(), false), kFail); // a directory is no document
+    EXPECT_EQ(root->ParseFile(dir.Path(), false), kFail); // a directory is no document
     const std::string bad = dir.Write("bad.xml", std::string(5000, ' ') + "\n<Top>\n<A>\n</B>\n");
     EXPECT_EQ(root->ParseFile(bad, false), kFail);
     EXPECT_EQ(TextOf(*root, u"XMLParseErrors"), u"Error on line 4 at column 2 of file " +
@@ -66,7 +66,7 @@ TEST(ResTreeLoader, IncludesLoadAsAChildOrIntoTheNodeAndLoopsStopWithAMessage) {
     dir.Write("child.xml", "<Module name='inc'><Where>#{site}</Where></Module>");
     dir.Write("children.xml", "<Anything><Merged>yes</Merged></Anything>");
     LoaderSettings settings;
-    settings.includeDirectory = dir.path();
+    settings.includeDirectory = dir.Path();
     auto root = Load(uR"(<Top site="lab">
         <:Include>child.xml</:Include>
         <:Include what="children">./children.xml</:Include>
@@ -79,7 +79,7 @@ TEST(ResTreeLoader, IncludesLoadAsAChildOrIntoTheNodeAndLoopsStopWithAMessage) {
     EXPECT_EQ(TextOf(*root, u"Merged"), u"yes");
     EXPECT_EQ(root->Type(), u"Top");
     EXPECT_NE(TextOf(*root, u"XMLParseErrors")
-                  .find(u"Unable to find include file node: " + FromUtf8Lenient(dir.path()) +
+                  .find(u"Unable to find include file node: " + FromUtf8Lenient(dir.Path()) +
                         u"/missing.xml"),
               std::u16string::npos);
     // Includes that come back around stop with a message.
@@ -98,7 +98,7 @@ TEST(ResTreeLoader, DeferredFilesLoadOnTheFirstMissOnce) {
     dir.Write("late.xml", "<Module><Group name='Late'/></Module>");
     dir.Write("parent.xml", "<Top><FromParent>p</FromParent></Top>");
     LoaderSettings settings;
-    settings.deferredDirectory = dir.path();
+    settings.deferredDirectory = dir.Path();
     // The link's lookup misses in m and loads m's files: late.xml, then the parent's, then
     // missing.xml fails and never.xml is not tried.
     auto root = Load(uR"(<Top>
@@ -119,16 +119,16 @@ TEST(ResTreeLoader, DeferredFilesLoadOnTheFirstMissOnce) {
 
 TEST(ResTreeLoader, FilesOutsideTheirDirectoryAreRefusedAndNeverQuoted) {
     ScratchDirectory dir;
-    std::filesystem::create_directory(dir.path() + "/descriptions");
-    std::filesystem::create_directory(dir.path() + "/private");
+    std::filesystem::create_directory(dir.Path() + "/descriptions");
+    std::filesystem::create_directory(dir.Path() + "/private");
     const std::string secret = dir.Write("private/secret.xml", "root:x:0:0:SECRET\nmore\n");
     dir.Write("descriptions/notes.txt", "token=SECRET\n");
     dir.Write("descriptions/ok.xml", "<Module name='ok'/>");
-    std::filesystem::create_directory_symlink(dir.path() + "/private",
-                                              dir.path() + "/descriptions/out");
-    std::filesystem::create_symlink(secret, dir.path() + "/descriptions/leak.xml");
+    std::filesystem::create_directory_symlink(dir.Path() + "/private",
+                                              dir.Path() + "/descriptions/out");
+    std::filesystem::create_symlink(secret, dir.Path() + "/descriptions/leak.xml");
     LoaderSettings settings;
-    settings.includeDirectory = dir.path() + "/descriptions";
+    settings.includeDirectory = dir.Path() + "/descriptions";
     settings.deferredDirectory = settings.includeDirectory;
     const std::u16string outside = u"The file lies outside the directory ";
     const std::u16string absolute = u"Absolute paths are not read";
@@ -157,7 +157,7 @@ TEST(ResTreeLoader, LookupsOutsideALoadUseTheDefaultSettings) {
     dir.Write("late.xml", "<Module><Late>1</Late></Module>");
     const LoaderSettings saved = DefaultLoaderSettings();
     LoaderSettings settings = saved;
-    settings.deferredDirectory = dir.path();
+    settings.deferredDirectory = dir.Path();
     SetDefaultLoaderSettings(settings);
     ResTreeNode root(u"", u"Module", false);
     root.SetText(u":DeferredLoadPath", u"late.xml");

@@ -133,7 +133,7 @@ TEST(ResourceCompare, CachedAnswersAreReusedUntilPushedOutByNewerPairs) {
     dir.Write("offer.xml", "<Part><Rate>fast</Rate></Part>");
     LoaderSettings settings = DefaultLoaderSettings();
     const LoaderSettings saved = settings;
-    settings.includeDirectory = dir.path();
+    settings.includeDirectory = dir.Path();
     SetDefaultLoaderSettings(settings);
     ClearCompareCache();
 

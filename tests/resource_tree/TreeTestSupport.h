@@ -2,10 +2,8 @@
 #pragma once
 
 #include "resource_tree/ResTreeNode.h"
+#include "support/ScratchFolder.h"
 
-#include <cstdlib>
-#include <filesystem>
-#include <fstream>
 #include <memory>
 #include <string>
 #include <vector>
@@ -50,30 +48,6 @@ inline ResTreeNode* ChildOf(ResTreeNode& node, std::u16string_view name) {
     return at == node.End() ? nullptr : at->Child();
 }
 
-// A directory of its own under the system's temporary directory, removed at the end.
-class ScratchDirectory {
-public:
-    ScratchDirectory() {
-        std::string pattern = (std::filesystem::temp_directory_path() / "restree-XXXXXX").string();
-        path_ = mkdtemp(pattern.data());
-    }
-    ~ScratchDirectory() {
-        std::error_code ignored;
-        std::filesystem::remove_all(path_, ignored);
-    }
-    ScratchDirectory(const ScratchDirectory&) = delete;
-    ScratchDirectory& operator=(const ScratchDirectory&) = delete;
-
-    const std::string& path() const { return path_; }
-    // Writes BYTES to the file NAME in the directory and answers its full path.
-    std::string Write(const std::string& name, const std::string& bytes) const {
-        const std::string full = path_ + "/" + name;
-        std::ofstream(full, std::ios::binary) << bytes;
-        return full;
-    }
-
-private:
-    std::string path_;
-};
+using ScratchDirectory = ::test::ScratchFolder;
 
 } // namespace wbhw::test

@@ -14,41 +14,15 @@
 #include "kern/Utf8.h"
 #include "provider/TIOIdentifiers.h"
 #include "session/HostSession.h"
+#include "support/ScratchFolder.h"
 
-#include <filesystem>
-#include <fstream>
 #include <functional>
 #include <gtest/gtest.h>
 #include <string>
-#include <unistd.h>
 
 namespace projecttest {
 
-// A fresh folder under the temporary directory, removed with everything in it at the end.
-class ScratchFolder {
-public:
-    ScratchFolder() {
-        std::string pattern =
-            (std::filesystem::temp_directory_path() / "wbhost-project-XXXXXX").string();
-        path_ = ::mkdtemp(pattern.data()) ? pattern : std::string();
-    }
-    ~ScratchFolder() {
-        std::error_code ignored;
-        std::filesystem::remove_all(path_, ignored);
-    }
-    ScratchFolder(const ScratchFolder&) = delete;
-    ScratchFolder& operator=(const ScratchFolder&) = delete;
-    std::string File(const std::string& name) const { return path_ + "/" + name; }
-    const std::string& Path() const { return path_; }
-    // Writes TEXT to NAME and answers its path.
-    std::string Write(const std::string& name, const std::string& text) const {
-        std::ofstream(File(name), std::ios::binary) << text;
-        return File(name);
-    }
-
-private:
-    std::string path_;
-};
+using ScratchFolder = ::test::ScratchFolder;
 
 inline constexpr const char* kDescription = R"(<Target>
   <Line name="DIO0"><IOInterface>DigitalLine</IOInterface><Protocols>IOResource</Protocols></Line>
