@@ -100,7 +100,7 @@ TEST_F(ResourceTreeTest, RenameTellsTheNodeItsParentAndEveryDescendantUnlessAmbi
     EXPECT_EQ(At(u"C0/Clock").Name(), u"clock");
 }
 
-TEST_F(ResourceTreeTest, RemovalWarnsDetachesThenTellsTheParent) {
+TEST_F(ResourceTreeTest, RemovalWarnsDetachesThenTellsTheParentAsInsertionDoes) {
     auto observer = test::NewObserver();
     Watch(observer.Get(), {u"C0", u"C0/DIO0", u"C0/DIO0/Pins/P1"});
     const auto removedObject = Object(u"C0/DIO0");
@@ -121,11 +121,8 @@ TEST_F(ResourceTreeTest, RemovalWarnsDetachesThenTellsTheParent) {
     EXPECT_EQ(removedObject->GetName(&name), E_FAIL);
     EXPECT_EQ(name, nullptr);
     EXPECT_EQ(Object(u"C0").As<IwbhwResourceTreeAccess>()->RemoveSubTree(u"DIO0"), S_FALSE);
-}
-
-TEST_F(ResourceTreeTest, InsertAddsTheDocumentBelowAndTellsTheParent) {
-    auto observer = test::NewObserver();
-    Watch(observer.Get(), {u"C0"});
+    // Inserting adds the document below and tells the parent.
+    observer->heard.clear();
     const auto access = Object(u"C0").As<IwbhwResourceTreeAccess>();
 
     ASSERT_EQ(access->InsertSubTree(u"<DigitalLine name=\"DIO2\"><Line>2</Line></DigitalLine>"),
@@ -179,7 +176,7 @@ TEST_F(ResourceTreeTest, PropertiesRaiseAddedChangedRemovedAndDisplayNameBits) {
     EXPECT_EQ(line->GetAttribute(u"Note", &value), S_FALSE);
 }
 
-TEST_F(ResourceTreeTest, MasksKindsAndSilencingDecideWhoHears) {
+TEST_F(ResourceTreeTest, MasksKindsSilencingAndRemovalsBelowANodeDecideWhoHears) {
     auto observer = test::NewObserver();
     const auto line = Object(u"C0/DIO1");
     ASSERT_EQ(line->AddObserver(observer.Get(), 0x4, 1), S_OK);
@@ -203,9 +200,7 @@ TEST_F(ResourceTreeTest, MasksKindsAndSilencingDecideWhoHears) {
 
     EXPECT_EQ(line->RemoveObserver(observer.Get(), 1, 0), S_OK);
     EXPECT_EQ(line->RemoveObserver(observer.Get(), 1, 0), S_FALSE);
-}
-
-TEST_F(ResourceTreeTest, RemovingEveryKindBelowANodeLeavesOtherObserversAlone) {
+    // Removing every kind below a node leaves other observers alone.
     auto items = test::NewObserver();
     auto other = test::NewObserver();
     Watch(items.Get(), {u"C0/DIO0", u"C0/DIO1"}, kAll, 3);

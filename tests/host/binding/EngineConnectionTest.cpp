@@ -78,7 +78,7 @@ TEST(EngineConnection, OpensStartsAndClosesThroughTheTableNamedOnesFromRevisionF
     EXPECT_EQ(CountersOf(named->library()).opens, 0);
 }
 
-TEST(EngineConnection, InstalledEngineIsFoundUnderTheShortenedVersion) {
+TEST(EngineConnection, InstalledEnginesAreFoundUnderTheShortenedVersionExplicitDirectoriesAsGiven) {
     const fs::path root = fs::temp_directory_path() / ("hostrt_engine_" + std::to_string(getpid()));
     const fs::path versionDir = root / "pf/Quorvane/Shared/Wirebench Run-Time/16.0";
     fs::create_directories(versionDir);
@@ -98,15 +98,13 @@ TEST(EngineConnection, InstalledEngineIsFoundUnderTheShortenedVersion) {
     connection.reset();
     EXPECT_EQ(rt::OpenEngineConnection(rt::kRunTimeEngine, "17.0f1", "", env), nullptr);
     fs::remove_all(root);
-}
-
-TEST(RuntimeLoader, ExplicitDirectoryIsUsedAsGivenAndKindTwoNeedsAnExistingExecutable) {
-    const rt::EngineSearchEnvironment env;
+    // An explicit directory is used as given; kind two needs an existing executable.
+    const rt::EngineSearchEnvironment bare;
     const std::string directory = fs::path(hostrt_test::FakeWbrtPath()).parent_path().string();
-    const DynamicModule loaded = rt::LoadRuntime(rt::kRunTimeEngine, "99.0", directory, env);
+    const DynamicModule loaded = rt::LoadRuntime(rt::kRunTimeEngine, "99.0", directory, bare);
     ASSERT_TRUE(loaded);
     EXPECT_EQ(rt::RuntimeVersionOf(loaded.handle()), "16.0");
-    EXPECT_FALSE(rt::LoadRuntime(rt::kFFRunTimeEngine, "", directory, env))
+    EXPECT_FALSE(rt::LoadRuntime(rt::kFFRunTimeEngine, "", directory, bare))
         << "that directory has no libwbffrt.so";
 
     rt::EngineSearchEnvironment noExecutable;

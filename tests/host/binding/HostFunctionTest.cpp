@@ -187,7 +187,7 @@ TEST_F(HostFunctionTest, EntryOfAnUnloadedModuleIsReused) {
     EXPECT_EQ(AnswerIn(answer, fakes[7].handle()), 8) << "the other entries are untouched";
 }
 
-TEST_F(HostFunctionTest, MissingExportGoesThroughTheFatalHookWithItsName) {
+TEST_F(HostFunctionTest, MissingExportsGoThroughTheFatalHookAndThoseOfDependenciesDoNotCount) {
     static rt::BoundFunction<AnswerFn> missing{"NoSuchHostFunction"};
     const auto fakes = LoadFakes(1, 1);
     rt::SetRuntimeModule(fakes[0].handle());
@@ -202,10 +202,6 @@ TEST_F(HostFunctionTest, MissingExportGoesThroughTheFatalHookWithItsName) {
                   "have been loaded into the same process.");
     }
     EXPECT_EQ(missing.TryAddress(), nullptr);
-}
-
-TEST_F(HostFunctionTest, ExportsOfDependenciesDoNotCount) {
-    const auto fakes = LoadFakes(1, 1);
     ASSERT_NE(dlsym(fakes[0].handle(), "strlen"), nullptr) << "found in the C library";
     EXPECT_EQ(qv::kern::osdep::ModuleExport(fakes[0].handle(), "strlen"), nullptr);
     EXPECT_NE(qv::kern::osdep::ModuleExport(fakes[0].handle(), "FakeAnswer"), nullptr);

@@ -60,7 +60,7 @@ TEST(HostArrayChecks, BoundsAndSizes) {
               "Error Code: 2 (00000002): The host ran out of memory.");
 }
 
-TEST(HostErrorToHResult, TableAndEverythingElseAsGeneralFailure) {
+TEST(HostErrorToHResult, MapsTheTableElseGeneralFailureAndExceptionsNameTheCodeAndTheHostsText) {
     EXPECT_EQ(HostErrorToHResult(0), 0);
     EXPECT_EQ(static_cast<uint32_t>(HostErrorToHResult(1)), 0x80070057u);
     EXPECT_EQ(static_cast<uint32_t>(HostErrorToHResult(2)), 0x8007000Eu);
@@ -69,9 +69,6 @@ TEST(HostErrorToHResult, TableAndEverythingElseAsGeneralFailure) {
     for (const int32_t other : {-1, 3, 42, 54, 0x7FFFFFFF}) {
         EXPECT_EQ(static_cast<uint32_t>(HostErrorToHResult(other)), 0x80004005u) << other;
     }
-}
-
-TEST(WBErrorException, PrefixHoldsTheCodeInDecimalAndHexWithTheHostsTextAndTextFormIsOne) {
     const auto& handles = wbhost::runtime::HandleTable::Instance();
     const size_t liveBefore = handles.LiveCount();
 

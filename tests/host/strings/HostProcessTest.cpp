@@ -14,16 +14,13 @@ using qv::kern::osdep::MainModule;
 
 namespace {
 
-TEST(HostProcess, ExecutableExportingTheRuntimeIsTheRuntimeModule) {
+TEST(HostProcess, TheExecutableIsTheRuntimeModuleAndAnswersHostFunctionsAndTheLanguage) {
     EXPECT_EQ(rt::CurrentRuntimeModule(), MainModule());
     EXPECT_EQ(rt::RuntimeVersionOf(MainModule()), "26.0");
 
     const rt::EngineSearchEnvironment env = rt::EngineSearchEnvironment::FromProcess();
     const auto same = rt::LoadRuntime(rt::kRunTimeEngine, "26.0", "", env);
     EXPECT_EQ(same.handle(), MainModule()) << "the process already is that runtime";
-}
-
-TEST(HostProcess, HostFunctionsAndTheUserInterfaceLanguageAnswerThroughTheResolver) {
     WBHandle block = rt::DSNewHClr(16);
     ASSERT_NE(block, nullptr);
     EXPECT_EQ(rt::NumericArrayResize(kWBTypeU64, 1, &block, 4), kWBNoErr);
