@@ -1,5 +1,5 @@
-// The text helpers, called through the loaded module with host strings that the embedded host's
-// runtime allocates, as a host program hands them over.
+// The text helpers and the exports of plain C values, called through the loaded module with host
+// strings that the embedded host's runtime allocates, as a host program hands them over.
 #include "cli/HostText.h"
 #include "cli/HostedModule.h"
 #include "runtime/Runtime.h"
@@ -121,6 +121,30 @@ TEST_F(TextExports, SearchAnswersByteOffsetsOfMatchesMultibyteRunsAndInvalidChar
     // A forbidden character outside ASCII is found too.
     EXPECT_EQ(check("caf\xE9", "\xE9"), 1);
     EXPECT_EQ(check("cafe", "\xE9"), 0);
+}
+
+// The exports of plain C values.
+TEST_F(TextExports, InfoAnswersFiveCompareTheThreeCodesTakingNullAsEmptyInTheDefaultCodePage) {
+    auto* getInfo = module.Find<int32_t()>("GetInfo");
+    auto* compare = module.Find<uint32_t(const char*, const char*)>("TIO_CompareTwoResourceTrees");
+    ASSERT_TRUE(getInfo && compare);
+    EXPECT_EQ(getInfo(), 5);
+    EXPECT_EQ(getInfo(), 5);
+
+    const std::string required = "<IOResource><Direction>Input</Direction></IOResource>";
+    const std::string offered =
+        "<IOResource><Direction>INPUT</Direction><Pull>up</Pull></IOResource>";
+    EXPECT_EQ(compare(nullptr, nullptr), 0u);
+    EXPECT_EQ(compare(nullptr, offered.c_str()), 2u);
+    EXPECT_EQ(compare(required.c_str(), ""), 1u);
+    EXPECT_EQ(compare(required.c_str(), required.c_str()), 0u);
+    EXPECT_EQ(compare(required.c_str(), offered.c_str()), 2u);
+    EXPECT_EQ(compare(offered.c_str(), required.c_str()), 1u);
+
+    // "\xE9" is e-acute in the default single-byte code page; as UTF-8 bytes it would be invalid.
+    const std::string lower = "<IOResource><Name>caf\xE9</Name></IOResource>";
+    const std::string upper = "<IOResource><Name>CAF\xC9</Name></IOResource>";
+    EXPECT_EQ(compare(lower.c_str(), upper.c_str()), 0u);
 }
 
 } // namespace

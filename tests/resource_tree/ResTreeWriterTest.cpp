@@ -3,6 +3,7 @@
 
 #include "TreeTestSupport.h"
 #include "kern/Utf8.h"
+#include "resource_tree/ListText.h"
 #include "resource_tree/LoaderText.h"
 
 #include <cstdlib>
@@ -168,7 +169,8 @@ private:
             } else if (what < 5) {
                 // A link to a node already written: an ancestor or one made before.
                 ResTreeNode* target = Pick(nodes_);
-                node.AddLink(node.End(), NodeName(), RelativeResourcePathFor(node, *target));
+                node.AddLink(node.End(), NodeName(),
+                             RelativeResourcePath(node.Path(), target->Path()));
             } else if (what < 6) {
                 const std::u16string list = u"eng=" + Text() + u",deu=" + Text();
                 node.AddText(node.End(), TextName(), LocalizeText(list, u"eng"),
@@ -178,24 +180,10 @@ private:
             }
         }
     }
-    static std::u16string RelativeResourcePathFor(const ResTreeNode& from, const ResTreeNode& to);
 
     std::mt19937 random_;
     std::vector<ResTreeNode*> nodes_;
 };
-
-} // namespace
-} // namespace wbhw
-
-#include "resource_tree/ListText.h"
-
-namespace wbhw {
-namespace {
-
-std::u16string TreeGenerator::RelativeResourcePathFor(const ResTreeNode& from,
-                                                      const ResTreeNode& to) {
-    return RelativeResourcePath(from.Path(), to.Path());
-}
 
 TEST(ResTreeWriter, GeneratedTreesRoundTripWhenFaithful) {
     int faithful = 0;

@@ -1,5 +1,6 @@
 // The Tangent I/O item in the embedded host: the real module's items bound to a real target's
-// tree, following its renames, removals and signature changes, saved and reopened.
+// tree, following its renames, removals and signature changes, saved and reopened; unique names
+// through the host's unique-name program, and a move whose rebinding fails.
 #include "ProjectTestSupport.h"
 #include "framework/IqxItemUI.h"
 #include "framework/IwbCompileConfiguration.h"
@@ -208,6 +209,58 @@ TEST_F(ItemBindingTest, FailingHostCallsComeBackAsStatusesAndLoseNothing) {
     ASSERT_EQ(As<IwbhwResourceItemUI2>(item)->Rebind(), S_OK);
     EXPECT_NE(StoredBag(item).find(u"/C0/DIO7"), std::u16string::npos);
     EXPECT_EQ(Status(item), 0);
+}
+
+// Two targets of two lines each, for name scopes and moves.
+constexpr const char* kScopeBoard = R"(<Target>
+  <Line name="DIO0"/>
+  <Line name="DIO1"/>
+</Target>
+)";
+
+class ItemScopeTest : public projecttest::ModuleProjectTest {
+protected:
+    void SetUp() override {
+        Open(kScopeBoard);
+        u = AddTarget(u"U", kScopeBoard);
+    }
+    // What ITEM's object makes of PROPOSED.
+    std::u16string Unique(ProjectItem* item, const char16_t* proposed) {
+        BSTR unique = nullptr;
+        EXPECT_EQ(qv::com::QueryAs<IwbTIOItemUIPrivate>(item->Object())
+                      ->GenerateUniqueName(proposed, &unique),
+                  S_OK);
+        return projecttest::TakeText(unique);
+    }
+
+    ComPtr<ProjectItem> u;
+};
+
+TEST_F(ItemScopeTest, UniqueNamesAskTheHostOnlyForATakenName) {
+    ProjectItem* pump = AddItem(u"Pump", u"/DIO0");
+    AddItem(u"pump1", u"/DIO1", AddFolder(u"F"));
+    ProjectItem* other = AddItem(u"Valve", u"/DIO0", u.Get());
+
+    EXPECT_EQ(Unique(other, u"Pump"), u"Pump"); // another scope: free, the program not run
+    EXPECT_TRUE(session.Programs().Runs().empty());
+    // Taken in the target (in a folder, in another case): the program gets every name there.
+    EXPECT_EQ(Unique(pump, u"PUMP"), u"PUMP2");
+    const auto runs = session.Programs().Runs();
+    ASSERT_EQ(runs.size(), 1u);
+    EXPECT_EQ(runs[0].behaviour, "unique-name");
+    EXPECT_EQ(std::get<std::u16string>(runs[0].inputs.at(0)), u"PUMP");
+    EXPECT_EQ(std::get<std::vector<std::u16string>>(runs[0].inputs.at(1)),
+              (std::vector<std::u16string>{u"Pump", u"pump1"}));
+}
+
+TEST_F(ItemScopeTest, AMoveWhoseBindingFailsAnswersTheStatusAndKeepsWhatWasStored) {
+    ProjectItem* pump = AddItem(u"Pump", u"/DIO0");
+    AddItem(u"Valve", u"/DIO0", u.Get()); // U's DIO0 is held: the moved item's status would change
+    const auto stored = pump->Bag().Properties();
+    const HRESULT diskFull = static_cast<HRESULT>(0x80070070);
+    pump->Bag().FailWrites(diskFull);
+    EXPECT_EQ(Project().MoveItem(*pump, *u.Get()), diskFull);
+    EXPECT_EQ(pump->Bag().Properties(), stored);
 }
 
 } // namespace
