@@ -42,4 +42,12 @@ int CompareNoCase(std::u16string_view a, std::u16string_view b) noexcept {
     }
 }
 
+uint64_t NameOrderKey(std::u16string_view name) noexcept {
+    try {
+        return ThreadCollator().OrderKey(name);
+    } catch (...) {
+        return 0;
+    }
+}
+
 } // namespace qv::kern

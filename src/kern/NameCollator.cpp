@@ -169,6 +169,7 @@ void NameCollator::BuildAsciiRanks(const char* locale) {
         ranks_[order[i]] = ++rank;
     }
     fastPath_ = true;
+    keyed_ = rank < 128;
 }
 
 bool NameCollator::AllRanked(std::u16string_view text) const noexcept {
@@ -177,6 +178,19 @@ bool NameCollator::AllRanked(std::u16string_view text) const noexcept {
             return false;
     }
     return true;
+}
+
+uint64_t NameCollator::OrderKey(std::u16string_view name) const noexcept {
+    // For names ranked whole, CompareRanks is the plain lexicographic order of the ranks (a
+    // contraction start only matters next to an unranked character), shorter first; packing
+    // the first ranks from the top keeps that order, and a missing unit (0) sorts before any.
+    if (!keyed_ || !AllRanked(name))
+        return 0;
+    uint64_t key = 0;
+    const size_t held = std::min(name.size(), kOrderKeyUnits);
+    for (size_t i = 0; i < held; ++i)
+        key |= static_cast<uint64_t>(ranks_[name[i]]) << (7 * (kOrderKeyUnits - i));
+    return key | (uint64_t{1} << 63);
 }
 
 int NameCollator::CompareRanks(std::u16string_view a, std::u16string_view b) const noexcept {

@@ -2,6 +2,8 @@
 // plain ASCII names that gives the same answers without calling into ICU.
 #pragma once
 
+#include "kern/Collate.h"
+
 #include <array>
 #include <cstdint>
 #include <memory>
@@ -27,6 +29,20 @@ public:
     int Compare(std::u16string_view a, std::u16string_view b) const noexcept;
     // The same answer, always through ICU (what the fast path must agree with).
     int CompareWithCollator(std::u16string_view a, std::u16string_view b) const noexcept;
+    // An integer whose unsigned order is this collator's for names the rank table covers whole:
+    // a set top bit, then the ranks of the first kOrderKeyUnits units, seven bits each, zero past
+    // the end of a shorter name, and seven zero bits. 0 for any other name (and for every name
+    // when the table cannot rank, or ranks too many characters for seven bits). A set stores it
+    // with each name, so that most comparisons are one integer compare and never read the names.
+    uint64_t OrderKey(std::u16string_view name) const noexcept;
+    // Compare(a, b), given their order keys: the keys decide when both are set and differ, or
+    // when they are equal and both names short enough to be held whole; else the names do.
+    int CompareKeyed(std::u16string_view a, uint64_t keyA, std::u16string_view b,
+                     uint64_t keyB) const noexcept {
+        const int byKeys = CompareOrderKeys(a.size(), keyA, b.size(), keyB);
+        return byKeys != 2 ? byKeys : Compare(a, b);
+    }
+
     // True when ASCII names (all of them, or those avoiding a few letters) skip ICU.
     bool HasAsciiFastPath() const noexcept { return fastPath_; }
     // True when ICU opened the collator.
@@ -50,6 +66,8 @@ private:
     // ASCII code units that begin a contraction continuing with characters outside the table.
     std::array<bool, 128> contractionStarts_{};
     bool fastPath_ = false;
+    // True when the fast path is on and every rank fits in seven bits (OrderKey).
+    bool keyed_ = false;
 };
 
 } // namespace qv::kern

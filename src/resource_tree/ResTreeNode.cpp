@@ -34,22 +34,18 @@ bool MayNameDeferredContent(std::u16string_view name) noexcept {
 
 } // namespace
 
-ResTreeEntry::ResTreeEntry(WString name, EntryKind kind) : name_(std::move(name)), kind_(kind) {}
+// A load makes one entry per element, and a comparison walks and frees them all again: every
+// byte of an entry is paid for in cache misses.
+static_assert(sizeof(ResTreeEntry) <= 2 * sizeof(WString) + 16, "an entry stays in its block size");
+
+ResTreeEntry::ResTreeEntry(WString name, EntryKind kind)
+    : name_(std::move(name)),
+      keyAndKind_(qv::kern::NameOrderKey(name_) | static_cast<uint64_t>(kind)) {}
 
 ResTreeEntry::~ResTreeEntry() = default;
 
 const WString* ResTreeEntry::Text() const noexcept {
-    return (IsTextKind(kind_) || kind_ == EntryKind::Link) ? &text_ : nullptr;
-}
-
-bool EntryNameLess::operator()(const ResTreeEntry& a, const ResTreeEntry& b) const noexcept {
-    return qv::kern::CompareNoCase(a.Name(), b.Name()) < 0;
-}
-bool EntryNameLess::operator()(const ResTreeEntry& a, std::u16string_view b) const noexcept {
-    return qv::kern::CompareNoCase(a.Name(), b) < 0;
-}
-bool EntryNameLess::operator()(std::u16string_view a, const ResTreeEntry& b) const noexcept {
-    return qv::kern::CompareNoCase(a, b.Name()) < 0;
+    return (IsTextKind(Kind()) || Kind() == EntryKind::Link) ? &text_ : nullptr;
 }
 
 ResTreePosition& ResTreePosition::operator++() noexcept {
@@ -92,7 +88,7 @@ ResTreeNode::Position ResTreeNode::End() const noexcept {
 
 ResTreeNode::Position ResTreeNode::Find(std::u16string_view name) const noexcept {
     if (!ordered_)
-        return Position(set_.find(name));
+        return Position(set_.find(EntryNameProbe(name)));
     if (list_.size() > kIndexFrom) {
         if (!index_) {
             index_ = std::make_unique<NameIndex>();
@@ -115,8 +111,9 @@ ResTreeNode::Place ResTreeNode::Locate(std::u16string_view name) const noexcept 
         const Position found = Find(name);
         return {found, found != End()};
     }
-    const auto at = set_.lower_bound(name);
-    return {Position(at), at != set_.end() && !EntryNameLess()(name, *at)};
+    const EntryNameProbe probe(name);
+    const auto at = set_.lower_bound(probe);
+    return {Position(at), at != set_.end() && !EntryNameLess()(probe, *at)};
 }
 
 ResTreeNode::Position ResTreeNode::FindLoading(std::u16string_view name) {
@@ -228,7 +225,7 @@ ResTreeNode::AddResult ResTreeNode::AddOrSetText(Position position, WString name
         at->text_ = std::move(text);
         RaiseChanges(kValueAdded);
     } else if (overwrite && SetTextAt(at, std::move(text)) && kind == EntryKind::LocalizedText) {
-        at->kind_ = kind;
+        at->SetKind(kind);
     }
     return {at, inserted};
 }
@@ -271,7 +268,7 @@ bool ResTreeNode::SetText(std::u16string_view name, WString text) {
 bool ResTreeNode::SetTextKindAt(Position position, EntryKind kind) {
     if (position == End() || !IsTextKind(position->Kind()) || !IsTextKind(kind))
         return false;
-    position->kind_ = kind;
+    position->SetKind(kind);
     return true;
 }
 
@@ -344,7 +341,7 @@ bool ResTreeNode::RemoveAt(Position position) {
     }
     position->child_.reset();
     position->text_.clear();
-    position->kind_ = EntryKind::Empty;
+    position->SetKind(EntryKind::Empty);
     EraseEntry(position);
     if (kind == EntryKind::Child || kind == EntryKind::Link)
         RaiseChanges(kChildRemoved);
@@ -382,14 +379,14 @@ void ResTreeNode::SetOrdered(bool ordered) {
         while (!set_.empty()) {
             auto handle = set_.extract(set_.begin());
             ResTreeEntry& entry = handle.value();
-            auto& moved = list_.emplace_back(std::move(entry.name_), entry.kind_);
+            auto& moved = list_.emplace_back(std::move(entry.name_), entry.Kind());
             moved.text_ = std::move(entry.text_);
             moved.child_ = std::move(entry.child_);
         }
     } else {
         while (!list_.empty()) {
             ResTreeEntry& entry = list_.front();
-            auto [at, inserted] = set_.emplace(entry.name_, entry.kind_);
+            auto [at, inserted] = set_.emplace(entry.name_, entry.Kind());
             if (inserted) {
                 at->text_ = std::move(entry.text_);
                 at->child_ = std::move(entry.child_);

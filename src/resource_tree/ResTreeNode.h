@@ -44,8 +44,13 @@ public:
 
     // The entry's name.
     const WString& Name() const noexcept { return name_; }
+    // The order key of the name (qv::kern::NameOrderKey), made once with the entry: sorted
+    // nodes and the comparison walk order most pairs of entries by it alone.
+    uint64_t NameKey() const noexcept { return keyAndKind_ & ~qv::kern::kOrderKeyFreeBits; }
     // The entry's kind.
-    EntryKind Kind() const noexcept { return kind_; }
+    EntryKind Kind() const noexcept {
+        return static_cast<EntryKind>(keyAndKind_ & qv::kern::kOrderKeyFreeBits);
+    }
     // The string of a Text, LocalizedText or Link entry; null for other kinds.
     const WString* Text() const noexcept;
     // The child node of a Child entry; null for other kinds.
@@ -53,20 +58,44 @@ public:
 
 private:
     friend class ResTreeNode;
+    void SetKind(EntryKind kind) const noexcept {
+        keyAndKind_ = NameKey() | static_cast<uint64_t>(kind);
+    }
+
     WString name_;
     // Unordered nodes keep entries in a set keyed by name, whose elements are const; the value
-    // is not part of the key, so it stays changeable.
-    mutable EntryKind kind_;
+    // is not part of the key, so it stays changeable. The kind shares a word with the name's
+    // order key (in the bits the key leaves free), which keeps an entry in its block size.
+    mutable uint64_t keyAndKind_;
     mutable WString text_;
     mutable std::unique_ptr<ResTreeNode> child_;
+};
+
+// -1, 0 or 1 as the names of two entries collate, without regard to case, in the user's locale.
+inline int CompareEntryNames(const ResTreeEntry& a, const ResTreeEntry& b) noexcept {
+    return qv::kern::CompareNoCaseKeyed(a.Name(), a.NameKey(), b.Name(), b.NameKey());
+}
+
+// A name looked up among sorted entries, with its order key made once for the whole descent.
+struct EntryNameProbe {
+    explicit EntryNameProbe(std::u16string_view n) noexcept
+        : name(n), key(qv::kern::NameOrderKey(n)) {}
+    std::u16string_view name;
+    uint64_t key;
 };
 
 // Orders entries by name without regard to case, in the user's locale.
 struct EntryNameLess {
     using is_transparent = void;
-    bool operator()(const ResTreeEntry& a, const ResTreeEntry& b) const noexcept;
-    bool operator()(const ResTreeEntry& a, std::u16string_view b) const noexcept;
-    bool operator()(std::u16string_view a, const ResTreeEntry& b) const noexcept;
+    bool operator()(const ResTreeEntry& a, const ResTreeEntry& b) const noexcept {
+        return CompareEntryNames(a, b) < 0;
+    }
+    bool operator()(const ResTreeEntry& a, const EntryNameProbe& b) const noexcept {
+        return qv::kern::CompareNoCaseKeyed(a.Name(), a.NameKey(), b.name, b.key) < 0;
+    }
+    bool operator()(const EntryNameProbe& a, const ResTreeEntry& b) const noexcept {
+        return qv::kern::CompareNoCaseKeyed(a.name, a.key, b.Name(), b.NameKey()) < 0;
+    }
 };
 
 // The entry containers of ordered and sorted nodes. Their elements come from a block pool: a
