@@ -208,7 +208,7 @@ void ParseStack::ProcessText(Frame& frame, const std::u16string& name, const Ste
         kind = EntryKind::LocalizedText;
     }
     CountEntry(name.size() + text.size());
-    node.AddOrSetText(InsertPosition(node, steering), WString(name), WString(std::move(text)), kind,
+    node.AddOrSetText(InsertPosition(node, steering), name, WString(std::move(text)), kind,
                       frame.overwrite);
 }
 

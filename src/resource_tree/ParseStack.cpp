@@ -274,7 +274,7 @@ size_t ParseStack::AppendError(ResTreeNode& node, std::u16string_view message) {
     if (found != node.End() && IsTextKind(found->Kind()))
         node.AppendTextAt(found, text);
     else
-        node.AddText(node.End(), WString(std::u16string(kParseErrors)), WString(std::move(text)));
+        node.AddText(node.End(), kParseErrors, WString(std::move(text)));
     return units;
 }
 

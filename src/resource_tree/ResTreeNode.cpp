@@ -36,13 +36,16 @@ bool MayNameDeferredContent(std::u16string_view name) noexcept {
 
 // A load makes one entry per element, and a comparison walks and frees them all again: every
 // byte of an entry is paid for in cache misses.
-static_assert(sizeof(ResTreeEntry) <= 2 * sizeof(WString) + 16, "an entry stays in its block size");
+static_assert(sizeof(ResTreeEntry) <= sizeof(WString) + 24, "an entry stays in its block size");
 
-ResTreeEntry::ResTreeEntry(WString name, EntryKind kind)
-    : name_(std::move(name)),
-      keyAndKind_(qv::kern::NameOrderKey(name_) | static_cast<uint64_t>(kind)) {}
+ResTreeEntry::ResTreeEntry(NameStore::Name& name, EntryKind kind) noexcept
+    : name_(&name), keyAndKind_(name.key | static_cast<uint64_t>(kind)) {
+    NameStore::AddUse(name);
+}
 
-ResTreeEntry::~ResTreeEntry() = default;
+ResTreeEntry::~ResTreeEntry() {
+    NameStore::Release(*name_);
+}
 
 const WString* ResTreeEntry::Text() const noexcept {
     return (IsTextKind(Kind()) || Kind() == EntryKind::Link) ? &text_ : nullptr;
@@ -57,15 +60,22 @@ ResTreePosition& ResTreePosition::operator++() noexcept {
 }
 
 ResTreeNode::ResTreeNode(WString name, WString type, bool ordered)
-    : name_(std::move(name)), type_(std::move(type)), ordered_(ordered), parent_(nullptr) {}
+    : ResTreeNode(std::move(name), std::move(type), ordered, nullptr) {}
 
 ResTreeNode::ResTreeNode(WString name, WString type, bool ordered, ResTreeNode* parent)
-    : name_(std::move(name)), type_(std::move(type)), ordered_(ordered), parent_(parent) {}
+    : name_(std::move(name)), type_(std::move(type)), ordered_(ordered), parent_(parent),
+      ownMemory_(parent != nullptr ? nullptr : std::make_unique<TreeMemory>()),
+      memory_(parent != nullptr ? parent->memory_ : ownMemory_.get()),
+      list_(ArenaAllocator<ResTreeEntry>(&memory_->arena)),
+      set_(EntryNameLess(), ArenaAllocator<ResTreeEntry>(&memory_->arena)) {}
 
 ResTreeNode::~ResTreeNode() {
     index_.reset();
     StopWatchingAll();
     parent_ = nullptr;
+    // The whole tree goes: its blocks go with the arena, none waits for reuse.
+    if (ownMemory_)
+        ownMemory_->arena.Close();
     // Children unregister from this node while it is still whole.
     list_.clear();
     set_.clear();
@@ -93,7 +103,7 @@ ResTreeNode::Position ResTreeNode::Find(std::u16string_view name) const noexcept
         if (!index_) {
             index_ = std::make_unique<NameIndex>();
             for (auto it = list_.begin(); it != list_.end(); ++it)
-                ++index_->try_emplace(std::u16string_view(it->name_), IndexedName{it, 0})
+                ++index_->try_emplace(std::u16string_view(it->Name()), IndexedName{it, 0})
                       .first->second.count;
         }
         const auto found = index_->find(name);
@@ -149,13 +159,14 @@ const WString* ResTreeNode::TextAt(std::u16string_view name) {
     return &found->text_;
 }
 
-ResTreeNode::Position ResTreeNode::InsertEntry(Position position, WString&& name, EntryKind kind,
-                                               bool& inserted, bool hinted) {
-    mayDefer_ = mayDefer_ || MayNameDeferredContent(name);
+ResTreeNode::Position ResTreeNode::InsertEntry(Position position, std::u16string_view spelling,
+                                               EntryKind kind, bool& inserted, bool hinted) {
+    mayDefer_ = mayDefer_ || MayNameDeferredContent(spelling);
+    NameStore::Name& name = memory_->names.Intern(spelling);
     if (ordered_) {
         inserted = true;
         const auto before = position.ordered_ ? position.list_ : list_.end();
-        const auto made = list_.emplace(before, std::move(name), kind);
+        const auto made = list_.emplace(before, name, kind);
         if (index_)
             IndexInserted(made, before == list_.end());
         return Position(made);
@@ -164,27 +175,28 @@ ResTreeNode::Position ResTreeNode::InsertEntry(Position position, WString&& name
         // From a place the caller has just looked up, the set checks the neighbours and inserts
         // there; only a wrong place costs a descent. (A position of the list is no place here.)
         const size_t before = set_.size();
-        const auto at = set_.emplace_hint(position.ordered_ ? set_.end() : position.set_,
-                                          std::move(name), kind);
+        const auto at =
+            set_.emplace_hint(position.ordered_ ? set_.end() : position.set_, name, kind);
         inserted = set_.size() != before;
         return Position(at);
     }
     // One descent of the tree both finds the place and tells whether the name is taken; a lookup
     // first and an insertion at its hint would compare the name a few more times (and names
     // compare in the user's locale).
-    const auto [at, isNew] = set_.emplace(std::move(name), kind);
+    const auto [at, isNew] = set_.emplace(name, kind);
     inserted = isNew;
     return Position(at);
 }
 
-ResTreeNode::AddResult ResTreeNode::AddText(Position position, WString name, WString text,
-                                            EntryKind kind) {
-    return AddOrSetText(position, std::move(name), std::move(text), kind, false);
+ResTreeNode::AddResult ResTreeNode::AddText(Position position, std::u16string_view name,
+                                            WString text, EntryKind kind) {
+    return AddOrSetText(position, name, std::move(text), kind, false);
 }
 
-ResTreeNode::AddResult ResTreeNode::AddLink(Position position, WString name, WString path) {
+ResTreeNode::AddResult ResTreeNode::AddLink(Position position, std::u16string_view name,
+                                            WString path) {
     bool inserted = false;
-    const Position at = InsertEntry(position, std::move(name), EntryKind::Link, inserted);
+    const Position at = InsertEntry(position, name, EntryKind::Link, inserted);
     if (inserted) {
         at->text_ = std::move(path);
         RaiseChanges(kChildAdded);
@@ -192,35 +204,33 @@ ResTreeNode::AddResult ResTreeNode::AddLink(Position position, WString name, WSt
     return {at, inserted};
 }
 
-ResTreeNode::AddChildResult ResTreeNode::AddChild(Position position, WString name, WString type,
-                                                  bool ordered) {
-    return MakeChild(position, std::move(name), std::move(type), ordered, false);
+ResTreeNode::AddChildResult ResTreeNode::AddChild(Position position, std::u16string_view name,
+                                                  WString type, bool ordered) {
+    return MakeChild(position, name, std::move(type), ordered, false);
 }
 
-ResTreeNode::AddChildResult ResTreeNode::AddChildAt(Position position, WString name, WString type,
-                                                    bool ordered) {
-    return MakeChild(position, std::move(name), std::move(type), ordered, true);
+ResTreeNode::AddChildResult ResTreeNode::AddChildAt(Position position, std::u16string_view name,
+                                                    WString type, bool ordered) {
+    return MakeChild(position, name, std::move(type), ordered, true);
 }
 
-ResTreeNode::AddChildResult ResTreeNode::MakeChild(Position position, WString&& name,
+ResTreeNode::AddChildResult ResTreeNode::MakeChild(Position position, std::u16string_view name,
                                                    WString&& type, bool ordered, bool hinted) {
     bool inserted = false;
-    WString childName = name;
-    const Position at = InsertEntry(position, std::move(name), EntryKind::Child, inserted, hinted);
+    const Position at = InsertEntry(position, name, EntryKind::Child, inserted, hinted);
     if (!inserted)
         return {at, at->child_.get(), false};
-    at->child_ =
-        std::make_unique<ResTreeNode>(std::move(childName), std::move(type), ordered, this);
+    at->child_ = std::make_unique<ResTreeNode>(WString(name), std::move(type), ordered, this);
     RaiseChanges(kChildAdded);
     return {at, at->child_.get(), true};
 }
 
-ResTreeNode::AddResult ResTreeNode::AddOrSetText(Position position, WString name, WString text,
-                                                 EntryKind kind, bool overwrite) {
+ResTreeNode::AddResult ResTreeNode::AddOrSetText(Position position, std::u16string_view name,
+                                                 WString text, EntryKind kind, bool overwrite) {
     if (!IsTextKind(kind))
         kind = EntryKind::Text;
     bool inserted = false;
-    const Position at = InsertEntry(position, std::move(name), kind, inserted);
+    const Position at = InsertEntry(position, name, kind, inserted);
     if (inserted) {
         at->text_ = std::move(text);
         RaiseChanges(kValueAdded);
@@ -259,7 +269,7 @@ void ResTreeNode::RaiseValueChanged(const ResTreeEntry& entry) {
 bool ResTreeNode::SetText(std::u16string_view name, WString text) {
     const Position found = FindLoading(name);
     if (found == End()) {
-        AddText(End(), WString(std::u16string(name)), std::move(text), EntryKind::Text);
+        AddText(End(), name, std::move(text), EntryKind::Text);
         return true;
     }
     return SetTextAt(found, std::move(text));
@@ -273,7 +283,8 @@ bool ResTreeNode::SetTextKindAt(Position position, EntryKind kind) {
 }
 
 void ResTreeNode::IndexInserted(EntryList::iterator entry, bool atEnd) {
-    const auto [at, isNew] = index_->emplace(std::u16string_view(entry->name_), IndexedName{entry});
+    const auto [at, isNew] =
+        index_->emplace(std::u16string_view(entry->Name()), IndexedName{entry});
     if (isNew)
         return;
     ++at->second.count;
@@ -285,14 +296,14 @@ void ResTreeNode::IndexInserted(EntryList::iterator entry, bool atEnd) {
             // The key views the first entry's name, so it is replaced along with it.
             const size_t count = at->second.count;
             index_->erase(at);
-            index_->emplace(std::u16string_view(entry->name_), IndexedName{entry, count});
+            index_->emplace(std::u16string_view(entry->Name()), IndexedName{entry, count});
             return;
         }
     }
 }
 
 void ResTreeNode::IndexErasing(EntryList::iterator entry) {
-    const auto at = index_->find(std::u16string_view(entry->name_));
+    const auto at = index_->find(std::u16string_view(entry->Name()));
     if (at == index_->end())
         return;
     const size_t left = at->second.count - 1;
@@ -304,8 +315,8 @@ void ResTreeNode::IndexErasing(EntryList::iterator entry) {
     if (left == 0)
         return;
     for (auto it = std::next(entry); it != list_.end(); ++it) {
-        if (qv::kern::EqualsNoCase(it->name_, entry->name_)) {
-            index_->emplace(std::u16string_view(it->name_), IndexedName{it, left});
+        if (qv::kern::EqualsNoCase(it->Name(), entry->Name())) {
+            index_->emplace(std::u16string_view(it->Name()), IndexedName{it, left});
             return;
         }
     }
@@ -379,14 +390,14 @@ void ResTreeNode::SetOrdered(bool ordered) {
         while (!set_.empty()) {
             auto handle = set_.extract(set_.begin());
             ResTreeEntry& entry = handle.value();
-            auto& moved = list_.emplace_back(std::move(entry.name_), entry.Kind());
+            auto& moved = list_.emplace_back(*entry.name_, entry.Kind());
             moved.text_ = std::move(entry.text_);
             moved.child_ = std::move(entry.child_);
         }
     } else {
         while (!list_.empty()) {
             ResTreeEntry& entry = list_.front();
-            auto [at, inserted] = set_.emplace(entry.name_, entry.Kind());
+            auto [at, inserted] = set_.emplace(*entry.name_, entry.Kind());
             if (inserted) {
                 at->text_ = std::move(entry.text_);
                 at->child_ = std::move(entry.child_);

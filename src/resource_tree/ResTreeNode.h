@@ -3,9 +3,10 @@
 
 #include "kern/Collate.h"
 #include "kern/StringBase.h"
-#include "resource_tree/BlockPool.h"
 #include "resource_tree/LoaderSettings.h"
+#include "resource_tree/NameStore.h"
 #include "resource_tree/ResTreeNodeChangeObserver.h"
+#include "resource_tree/TreeArena.h"
 
 #include <cstdint>
 #include <list>
@@ -37,13 +38,14 @@ inline bool IsTextKind(EntryKind kind) noexcept {
 // One named entry of a node. Entries are changed only through their node.
 class ResTreeEntry {
 public:
-    ResTreeEntry(WString name, EntryKind kind);
+    // An entry named NAME (of its tree's name store), counted as one use of it.
+    ResTreeEntry(NameStore::Name& name, EntryKind kind) noexcept;
     ~ResTreeEntry();
     ResTreeEntry(const ResTreeEntry&) = delete;
     ResTreeEntry& operator=(const ResTreeEntry&) = delete;
 
     // The entry's name.
-    const WString& Name() const noexcept { return name_; }
+    const WString& Name() const noexcept { return name_->spelling; }
     // The order key of the name (qv::kern::NameOrderKey), made once with the entry: sorted
     // nodes and the comparison walk order most pairs of entries by it alone.
     uint64_t NameKey() const noexcept { return keyAndKind_ & ~qv::kern::kOrderKeyFreeBits; }
@@ -62,7 +64,7 @@ private:
         keyAndKind_ = NameKey() | static_cast<uint64_t>(kind);
     }
 
-    WString name_;
+    NameStore::Name* name_;
     // Unordered nodes keep entries in a set keyed by name, whose elements are const; the value
     // is not part of the key, so it stays changeable. The kind shares a word with the name's
     // order key (in the bits the key leaves free), which keeps an entry in its block size.
@@ -98,10 +100,10 @@ struct EntryNameLess {
     }
 };
 
-// The entry containers of ordered and sorted nodes. Their elements come from a block pool: a
-// load makes one for nearly every element of a document.
-using EntryList = std::list<ResTreeEntry, PoolAllocator<ResTreeEntry>>;
-using EntrySet = std::set<ResTreeEntry, EntryNameLess, PoolAllocator<ResTreeEntry>>;
+// The entry containers of ordered and sorted nodes. Their elements come from the arena of their
+// tree: a load makes one for nearly every element of a document.
+using EntryList = std::list<ResTreeEntry, ArenaAllocator<ResTreeEntry>>;
+using EntrySet = std::set<ResTreeEntry, EntryNameLess, ArenaAllocator<ResTreeEntry>>;
 
 // A position among a node's entries; equal to the node's End() when it names no entry.
 class ResTreePosition {
@@ -196,22 +198,24 @@ public:
 
     // Inserts a Text or LocalizedText entry before POSITION (ordered) or by name (unordered; an
     // existing name is kept and its position answered). Raises ValueAdded when inserted.
-    AddResult AddText(Position position, WString name, WString text,
+    AddResult AddText(Position position, std::u16string_view name, WString text,
                       EntryKind kind = EntryKind::Text);
     // AddText, and when the name exists (unordered) and OVERWRITE, sets its text (and for a
     // LocalizedText its kind) as SetTextAt does.
-    AddResult AddOrSetText(Position position, WString name, WString text, EntryKind kind,
-                           bool overwrite);
+    AddResult AddOrSetText(Position position, std::u16string_view name, WString text,
+                           EntryKind kind, bool overwrite);
     // The same for a Link entry holding PATH. Raises ChildAdded when inserted.
-    AddResult AddLink(Position position, WString name, WString path);
+    AddResult AddLink(Position position, std::u16string_view name, WString path);
     // Inserts a new child node, or (unordered) answers the existing entry of that name as is.
     // Raises ChildAdded when created.
-    AddChildResult AddChild(Position position, WString name, WString type, bool ordered);
+    AddChildResult AddChild(Position position, std::u16string_view name, WString type,
+                            bool ordered);
     // AddChild, where a sorted node starts from POSITION (End() or an entry of this node) instead
     // of its root: with what Locate(NAME) answered, and no entry removed since, the insertion costs
     // two comparisons of names, not a second descent; another place only costs the descent. An
     // ordered node inserts before POSITION, as AddChild does.
-    AddChildResult AddChildAt(Position position, WString name, WString type, bool ordered);
+    AddChildResult AddChildAt(Position position, std::u16string_view name, WString type,
+                              bool ordered);
     // Replaces the string of a text entry; false (and no change) for End and other kinds.
     bool SetTextAt(Position position, WString text);
     // Appends TEXT to the string of a text entry; false (and no change) for End and other kinds.
@@ -314,10 +318,10 @@ private:
     bool IsWatching(const ResTreeNode& other) const noexcept;
     // Inserts a new entry (an unordered node keeps an existing one of that name and answers it);
     // a sorted node looks for the place from POSITION when HINTED, else from its root.
-    Position InsertEntry(Position position, WString&& name, EntryKind kind, bool& inserted,
-                         bool hinted = false);
-    AddChildResult MakeChild(Position position, WString&& name, WString&& type, bool ordered,
-                             bool hinted);
+    Position InsertEntry(Position position, std::u16string_view name, EntryKind kind,
+                         bool& inserted, bool hinted = false);
+    AddChildResult MakeChild(Position position, std::u16string_view name, WString&& type,
+                             bool ordered, bool hinted);
     void EraseEntry(Position position) noexcept;
     // Raises the changes of a new value in the text entry ENTRY of this node.
     void RaiseValueChanged(const ResTreeEntry& entry);
@@ -342,6 +346,13 @@ private:
     int32_t deferDepth_ = 0;
     uint32_t useCount_ = 0;
     ResTreeNode* parent_;
+    // The memory of a tree's entries and their names; the root owns it, every node uses it.
+    struct TreeMemory {
+        TreeArena arena;
+        NameStore names;
+    };
+    std::unique_ptr<TreeMemory> ownMemory_;
+    TreeMemory* memory_;
     mutable EntryList list_;
     mutable EntrySet set_;
     std::unique_ptr<Observers> observers_;

@@ -62,7 +62,7 @@ HRESULT ResourceTree::SetAttribute(ResTreeNode& node, std::u16string_view name,
     const auto found = node.FindLoading(name);
     uint32_t events = 0;
     if (found == node.End()) {
-        node.AddText(node.End(), wbhw::WString(name), wbhw::WString(value));
+        node.AddText(node.End(), name, wbhw::WString(value));
         events = event::kValueAdded;
     } else if (node.SetTextAt(found, wbhw::WString(value))) {
         events = event::kValueChanged;
