@@ -61,7 +61,23 @@ protected:
     CreateMultipleFn* createMultiple = nullptr;
 };
 
-TEST_F(ItemCreationTest, CreateMultipleMakesFoldersOnceKeepsEscapedSlashesAndHidesAsTheTreeSays) {
+TEST_F(ItemCreationTest,
+       CreateMultipleMakesFoldersOnceKeepsEscapedSlashesHidesAsTheTreeSaysOrFailsEmpty) {
+    WBRefNum refnum = wbhost::runtime::RefnumTable::Instance().Add(target->Object());
+    wbhost::cli::HostStringList none({});
+    EXPECT_EQ(createMultiple(&refnum, &none.Handle()), E_FAIL);
+    WBHandle null = nullptr;
+    EXPECT_EQ(createMultiple(&refnum, &null), E_FAIL);
+    EXPECT_EQ(createMultiple(&refnum, nullptr), E_FAIL);
+    wbhost::runtime::RefnumTable::Instance().Remove(refnum);
+    wbhost::cli::HostStringList one({"<AttributeSet name=\"\"/>"});
+    const WBRefNum unknown = 0xFFFFFFF0u;
+    EXPECT_EQ(createMultiple(&unknown, &one.Handle()), E_INVALIDARG);
+    // A tree's refnum is no project item.
+    const WBRefNum tree = Target().Target().refnum;
+    EXPECT_EQ(createMultiple(&tree, &one.Handle()), E_NOINTERFACE);
+    EXPECT_TRUE(target->Children().empty());
+    // Definitions make their folders once, keep escaped slashes and hide as the tree says.
     ASSERT_EQ(CreateMultiple(*target.Get(), {{u"A/B/Valve", u"/C0/DIO0"},
                                              {u"a/B/Pump", u"/C0/DIO2"},
                                              {u"Pump\\/Valve", u"/C0/DIO3"},
@@ -93,23 +109,6 @@ TEST_F(ItemCreationTest, CreateMultipleMakesFoldersOnceKeepsEscapedSlashesAndHid
     // A folder part naming an item that is no folder is refused rather than filled.
     EXPECT_EQ(CreateMultiple(*target.Get(), {{u"Hidden/X", u"/C0/DIO4"}}), kNameTaken);
     EXPECT_EQ(At({u"Hidden"})->Children().size(), 0u);
-}
-
-TEST_F(ItemCreationTest, EmptyDefinitionsOrABadRefnumCreateNothingAndFail) {
-    WBRefNum refnum = wbhost::runtime::RefnumTable::Instance().Add(target->Object());
-    wbhost::cli::HostStringList none({});
-    EXPECT_EQ(createMultiple(&refnum, &none.Handle()), E_FAIL);
-    WBHandle null = nullptr;
-    EXPECT_EQ(createMultiple(&refnum, &null), E_FAIL);
-    EXPECT_EQ(createMultiple(&refnum, nullptr), E_FAIL);
-    wbhost::runtime::RefnumTable::Instance().Remove(refnum);
-    wbhost::cli::HostStringList one({"<AttributeSet name=\"\"/>"});
-    const WBRefNum unknown = 0xFFFFFFF0u;
-    EXPECT_EQ(createMultiple(&unknown, &one.Handle()), E_INVALIDARG);
-    // A tree's refnum is no project item.
-    const WBRefNum tree = Target().Target().refnum;
-    EXPECT_EQ(createMultiple(&tree, &one.Handle()), E_NOINTERFACE);
-    EXPECT_TRUE(target->Children().empty());
 }
 
 TEST_F(ItemCreationTest, AFailingCreationKeepsTheItemsBeforeItAndTheTargetsChangeHandling) {

@@ -103,7 +103,7 @@ protected:
     wbhost::runtime::FailureScope failures;
 };
 
-TEST_F(NameControlTest, ListsTheResourcesThatFitAndAPlaceholderWhenNoneDo) {
+TEST_F(NameControlTest, ListsTheResourcesThatFitOrAPlaceholderAndQueriesCheckTargetsAndInterfaces) {
     uint32_t count = 0;
     BSTR* categories = nullptr;
     ASSERT_EQ(names->ListCategories(&count, &categories), S_OK);
@@ -136,10 +136,8 @@ TEST_F(NameControlTest, ListsTheResourcesThatFitAndAPlaceholderWhenNoneDo) {
     EXPECT_EQ(TakeList(list), (std::vector<Entry>{{"FPGA I/O resources of this target", false}}));
     ASSERT_EQ(names->CheckTarget(0xFFFFFF00u, &list, &status), S_OK);
     EXPECT_EQ(TakeList(list), (std::vector<Entry>{{"FPGA I/O resources of this target", true}}));
-}
-
-TEST_F(NameControlTest, QueriesCheckTheTargetAndCompareTwoControlsInterfaces) {
-    int32_t status = -1;
+    // Queries check the target and compare two controls' interfaces.
+    status = -1;
     EXPECT_EQ(names->Query(1, appRef, nullptr, nullptr, &status), 0);
     EXPECT_EQ(status, 0);
     EXPECT_EQ(names->Query(1, 0xFFFFFF00u, nullptr, nullptr, &status), kNameControlNoTarget);

@@ -58,7 +58,7 @@ protected:
     wbhost::resources::ResourceService service;
 };
 
-TEST_F(ProjectFormatTest, EverythingReadsBackUnchanged) {
+TEST_F(ProjectFormatTest, EverythingReadsBackUnchangedWithEachFieldKeptToOneField) {
     Project project(service, u"My Project");
     std::string error;
     // A file name that is not valid UTF-16 material: kept as bytes.
@@ -144,10 +144,8 @@ TEST_F(ProjectFormatTest, EverythingReadsBackUnchanged) {
     ASSERT_TRUE(reopened->Save(path, &error)) << error;
     ASSERT_TRUE(wbhost::project::ReadWholeFile(path, second, nullptr));
     EXPECT_EQ(first, second);
-}
-
-TEST_F(ProjectFormatTest, EscapedFieldsKeepToOneField) {
-    for (const auto& text : AwkwardTexts()) {
+    // Each escaped field keeps to one field of the line.
+    for (const auto& text : texts) {
         const std::string field = wbhost::project::EscapeField(text);
         EXPECT_FALSE(field.empty());
         EXPECT_EQ(field.find_first_of(" \n\r"), std::string::npos);
@@ -157,7 +155,7 @@ TEST_F(ProjectFormatTest, EscapedFieldsKeepToOneField) {
     }
 }
 
-TEST_F(ProjectFormatTest, MalformedFilesAreRefusedWithTheLine) {
+TEST_F(ProjectFormatTest, MalformedOrCutFilesAreRefusedWithTheLine) {
     const std::string root = "item {00000000-0000-0000-0000-000000000001} - "
                              "{CD645BF2-83EE-4D8F-9768-1ACEEB221DF0} 00000010 P\n";
     const std::string head = "wbhost-project 1\n" + root;
@@ -203,9 +201,7 @@ TEST_F(ProjectFormatTest, MalformedFilesAreRefusedWithTheLine) {
     // A file that went through a line-ending conversion still reads.
     EXPECT_TRUE(wbhost::project::ParseProject(
         "wbhost-project 1\r\n" + root.substr(0, root.size() - 1) + "\r\nend\r\n", saved, nullptr));
-}
-
-TEST_F(ProjectFormatTest, EveryCutOfAFileIsRefused) {
+    // Every cut of a file is refused.
     Project project(service);
     IwbProjectItem* folder = nullptr;
     project.Root().CreateChild(wbproj::kFolderType, u"F", &folder);

@@ -86,7 +86,7 @@ protected:
     std::string description;
 };
 
-TEST_F(SessionTest, TheModuleLoadsOnceAndItsProviderStartsAndAnswersAcrossTheBoundary) {
+TEST_F(SessionTest, TheModuleLoadsOnceItsProviderStartsAndHoldsEachProjectUntilItCloses) {
     // The provider keeps the root object it was started with.
     EXPECT_EQ(References(session.RootObject()), 2u);
     std::string error;
@@ -97,10 +97,7 @@ TEST_F(SessionTest, TheModuleLoadsOnceAndItsProviderStartsAndAnswersAcrossTheBou
     BSTR name = nullptr;
     ASSERT_EQ(session.Provider()->GetTypeName(tio::kIOItemType, &name), S_OK);
     EXPECT_EQ(TakeText(name), u"Tangent IO");
-}
-
-TEST_F(SessionTest, TheProviderIsAttachedToEachProjectAndLetsItGoOnClose) {
-    std::string error;
+    // The provider is attached to each project and lets it go on close.
     ASSERT_TRUE(session.NewProject(u"", &error)) << error;
     EXPECT_EQ(session.Project()->Root().Name(), u"Project");
     auto root = ComPtr<IwbProjectItem>::Share(&session.Project()->Root());
