@@ -33,7 +33,7 @@ public:
     }
 };
 
-TEST(ResTreeObservers, DisplayNameReachesTheChildAndItsParent) {
+TEST(ResTreeObservers, DisplayNameReachesChildAndParentRemovalTellsTheChildBeforeAndAfter) {
     ResTreeNode root(u"", u"Target", false);
     ResTreeNode* child = root.AddChild(root.End(), u"c", u"IOResource", false).node;
     child->SetText(u"DisplayName", u"old");
@@ -59,23 +59,21 @@ TEST(ResTreeObservers, DisplayNameReachesTheChildAndItsParent) {
     EXPECT_EQ(onRoot.calls[0].changes, kChildDisplayNameChanged | kValueAdded);
     // Bits outside an observer's mask are not delivered to it but are not kept either.
     EXPECT_EQ(root.PendingChanges(), 0u);
-}
-
-TEST(ResTreeObservers, RemovalTellsTheChildBeforeAndAfterItsChildrenGo) {
-    ResTreeNode root(u"", u"Target", false);
-    ResTreeNode* child = root.AddChild(root.End(), u"c", u"Module", false).node;
-    child->AddChild(child->End(), u"g", u"IOResource", false);
-    Recorder onChild, onRoot;
+    // Removal tells the child before and after its children go.
+    ResTreeNode top(u"", u"Target", false);
+    ResTreeNode* module = top.AddChild(top.End(), u"c", u"Module", false).node;
+    module->AddChild(module->End(), u"g", u"IOResource", false);
+    Recorder onModule, onTop;
     std::vector<uint32_t> order;
-    child->AddObserver(&onChild, kAllChanges, 0);
-    onChild.during = [&] { order.push_back(onChild.calls.back().changes); };
-    root.AddObserver(&onRoot, kAllChanges, 0);
-    root.RemoveByName(u"c");
+    module->AddObserver(&onModule, kAllChanges, 0);
+    onModule.during = [&] { order.push_back(onModule.calls.back().changes); };
+    top.AddObserver(&onTop, kAllChanges, 0);
+    top.RemoveByName(u"c");
     EXPECT_EQ(order, (std::vector<uint32_t>{kDetaching, kChildRemoved, kDetached}));
-    EXPECT_EQ(onRoot.All(), kChildRemoved);
-    root.AddText(root.End(), u"t", u"");
-    root.RemoveByName(u"t");
-    EXPECT_EQ(onRoot.All(), kChildRemoved | kValueAdded | kValueRemoved);
+    EXPECT_EQ(onTop.All(), kChildRemoved);
+    top.AddText(top.End(), u"t", u"");
+    top.RemoveByName(u"t");
+    EXPECT_EQ(onTop.All(), kChildRemoved | kValueAdded | kValueRemoved);
 }
 
 TEST(ResTreeObservers, ObserversLeavingOrJoiningDuringAPass) {
@@ -122,7 +120,7 @@ TEST(ResTreeObservers, ChangesRaisedDuringDeliveryGoOutInAFurtherPassAWholeLoadI
     EXPECT_EQ(onLoad.calls[0].changes, kValueAdded | kChildAdded);
 }
 
-TEST(ResTreeObservers, AncestorAndReservationChangesAreForwarded) {
+TEST(ResTreeObservers, AncestorAndReservationChangesAreForwardedRingsEndTheirDelivery) {
     ResTreeNode root(u"", u"Target", false);
     ResTreeNode* a = root.AddChild(root.End(), u"a", u"Module", false).node;
     ResTreeNode* pin = a->AddChild(a->End(), u"pin", u"IOResource", false).node;
@@ -140,6 +138,36 @@ TEST(ResTreeObservers, AncestorAndReservationChangesAreForwarded) {
     onPin.calls.clear();
     a->RaiseChanges(kAncestorChanged);
     EXPECT_TRUE(onPin.calls.empty());
+    // Rings end their delivery, yet changes made during it go out.
+    // Two nodes reserving each other, and ra node reserving its own parent.
+    ResTreeNode ring(u"", u"Target", false);
+    ResTreeNode* ra = ring.AddChild(ring.End(), u"ra", u"IOResource", false).node;
+    ResTreeNode* rb = ring.AddChild(ring.End(), u"rb", u"IOResource", false).node;
+    ra->SetText(u"Reserves", u"../rb");
+    rb->SetText(u"Reserves", u"../ra");
+    rb->SetText(u"DisplayName", u"rb");
+    ResTreeNode* self = ra->AddChild(ra->End(), u"self", u"IOResource", false).node;
+    self->SetText(u"Reserves", u"..");
+    Recorder onRa, onSelf;
+    ra->AddObserver(&onRa, kReservationChanged | kDisplayNameChanged | kValueAdded, 0);
+    self->AddObserver(&onSelf, kAncestorChanged | kReservationChanged, 0);
+    rb->RaiseChanges(kReservationChanged);
+    EXPECT_EQ(onRa.All(), kReservationChanged);
+    EXPECT_LT(onRa.calls.size(), 4u);
+    EXPECT_NE(onSelf.All() & kReservationChanged, 0u);
+
+    // While A delivers ra change of its own, its observer renames B. That rename reaches A during
+    // A's delivery but is news, not A's change coming back: it goes out in ra further pass, whose
+    // own echo from B is dropped in turn.
+    onRa.calls.clear();
+    onRa.during = [&] {
+        if (onRa.calls.size() == 1)
+            rb->SetText(u"DisplayName", u"renamed");
+    };
+    ra->AddText(ra->End(), u"v", u"");
+    ASSERT_EQ(onRa.calls.size(), 2u);
+    EXPECT_EQ(onRa.calls[0].changes, kValueAdded);
+    EXPECT_NE(onRa.calls[1].changes & kDisplayNameChanged, 0u);
 }
 
 TEST(ResTreeObservers, WatchingSurvivesAnyTeardownOrder) {
@@ -170,38 +198,6 @@ TEST(ResTreeObservers, WatchingSurvivesAnyTeardownOrder) {
         root->AddText(root->End(), u"after", u"");
         root.reset(); // and the sanitizers tell if anything was left dangling
     }
-}
-
-TEST(ResTreeObservers, RingsEndTheirDeliveryYetChangesMadeDuringItGoOut) {
-    // Two nodes reserving each other, and a node reserving its own parent.
-    ResTreeNode root(u"", u"Target", false);
-    ResTreeNode* a = root.AddChild(root.End(), u"a", u"IOResource", false).node;
-    ResTreeNode* b = root.AddChild(root.End(), u"b", u"IOResource", false).node;
-    a->SetText(u"Reserves", u"../b");
-    b->SetText(u"Reserves", u"../a");
-    b->SetText(u"DisplayName", u"b");
-    ResTreeNode* inner = a->AddChild(a->End(), u"inner", u"IOResource", false).node;
-    inner->SetText(u"Reserves", u"..");
-    Recorder onA, onInner;
-    a->AddObserver(&onA, kReservationChanged | kDisplayNameChanged | kValueAdded, 0);
-    inner->AddObserver(&onInner, kAncestorChanged | kReservationChanged, 0);
-    b->RaiseChanges(kReservationChanged);
-    EXPECT_EQ(onA.All(), kReservationChanged);
-    EXPECT_LT(onA.calls.size(), 4u);
-    EXPECT_NE(onInner.All() & kReservationChanged, 0u);
-
-    // While A delivers a change of its own, its observer renames B. That rename reaches A during
-    // A's delivery but is news, not A's change coming back: it goes out in a further pass, whose
-    // own echo from B is dropped in turn.
-    onA.calls.clear();
-    onA.during = [&] {
-        if (onA.calls.size() == 1)
-            b->SetText(u"DisplayName", u"renamed");
-    };
-    a->AddText(a->End(), u"v", u"");
-    ASSERT_EQ(onA.calls.size(), 2u);
-    EXPECT_EQ(onA.calls[0].changes, kValueAdded);
-    EXPECT_NE(onA.calls[1].changes & kDisplayNameChanged, 0u);
 }
 
 } // namespace

@@ -55,7 +55,35 @@ TEST(CliEditParse, EachActionTakesItsOwnArgumentsAndKeptDescriptionsArePlainFile
     EXPECT_EQ(EditedDescriptionPath("x", u"../a b/\u00e9"), "x.___a_b___.xml");
 }
 
-TEST_F(CliEdit, EditsReachTheReopenedProjectAndNeverTheOriginalDescription) {
+TEST_F(CliEdit, RefusedEditsChangeNoFileOthersReachTheReopenedProjectNeverTheDescription) {
+    const std::string saved = Slurp(p.path);
+    const std::string broken = p.scratch.Write("broken.xml", "<Line name=\"X\"><Oops></Line>");
+    const struct {
+        const char* action;
+        std::vector<std::string> arguments;
+        const char* says;
+    } refusals[] = {
+        {"rename", {"DIO9", "X"}, "no node \"DIO9\""},
+        {"rename", {"DIO0", "AI0"}, "cannot rename /DIO0"},
+        {"rename", {"DIO0", ""}, "cannot rename"},
+        {"remove", {"/"}, "root of a target cannot be removed"},
+        {"remove", {"AI0/X"}, "no node"},
+        {"insert", {"DIO9", broken}, "no node"},
+        {"insert", {"/", broken}, "does not load"},
+        {"insert", {"/", p.scratch.File("missing.xml")}, "cannot read"},
+        {"remove-attribute", {"DIO0", "Nothing"}, "has no attribute \"Nothing\""},
+        {"set-attribute", {"/", "DIO0", "x"}, "not an attribute"},
+        {"set-attribute", {"DIO9", "A", "x"}, "no node"},
+    };
+    for (const auto& each : refusals) {
+        EXPECT_EQ(p.Edit(each.action, each.arguments), 1) << each.says;
+        EXPECT_NE(p.err.str().find(each.says), std::string::npos) << p.err.str();
+        EXPECT_EQ(Slurp(p.path), saved) << each.says;
+        EXPECT_FALSE(std::filesystem::exists(EditedDescriptionPath(p.path, u"T"))) << each.says;
+    }
+    EditRequest request{"U", EditKind::Remove, "AI0", "", ""};
+    EXPECT_EQ(RunEdit(Options(), p.path, request, p.out, p.err), 1);
+    // Edits reach the reopened project and never the original description.
     const std::string original = Slurp(p.description);
     ASSERT_EQ(p.Edit("rename", {"DIO0", "Valve0"}), 0) << p.err.str();
     EXPECT_NE(p.out.str().find("renamed /DIO0 to \"Valve0\""), std::string::npos);
@@ -102,36 +130,6 @@ TEST_F(CliEdit, AttributeEditsAreKeptAndTheItemsStateIsListed) {
              {"resource", "status", "statusText", "hidden", "featureSetVersion"})
             EXPECT_TRUE(item.contains(field)) << field;
     }
-}
-
-TEST_F(CliEdit, RefusedEditsChangeNoFile) {
-    const std::string saved = Slurp(p.path);
-    const std::string broken = p.scratch.Write("broken.xml", "<Line name=\"X\"><Oops></Line>");
-    const struct {
-        const char* action;
-        std::vector<std::string> arguments;
-        const char* says;
-    } refusals[] = {
-        {"rename", {"DIO9", "X"}, "no node \"DIO9\""},
-        {"rename", {"DIO0", "AI0"}, "cannot rename /DIO0"},
-        {"rename", {"DIO0", ""}, "cannot rename"},
-        {"remove", {"/"}, "root of a target cannot be removed"},
-        {"remove", {"AI0/X"}, "no node"},
-        {"insert", {"DIO9", broken}, "no node"},
-        {"insert", {"/", broken}, "does not load"},
-        {"insert", {"/", p.scratch.File("missing.xml")}, "cannot read"},
-        {"remove-attribute", {"DIO0", "Nothing"}, "has no attribute \"Nothing\""},
-        {"set-attribute", {"/", "DIO0", "x"}, "not an attribute"},
-        {"set-attribute", {"DIO9", "A", "x"}, "no node"},
-    };
-    for (const auto& each : refusals) {
-        EXPECT_EQ(p.Edit(each.action, each.arguments), 1) << each.says;
-        EXPECT_NE(p.err.str().find(each.says), std::string::npos) << p.err.str();
-        EXPECT_EQ(Slurp(p.path), saved) << each.says;
-        EXPECT_FALSE(std::filesystem::exists(EditedDescriptionPath(p.path, u"T"))) << each.says;
-    }
-    EditRequest request{"U", EditKind::Remove, "AI0", "", ""};
-    EXPECT_EQ(RunEdit(Options(), p.path, request, p.out, p.err), 1);
 }
 
 constexpr const char* kBoard = R"(<Target name="Board">

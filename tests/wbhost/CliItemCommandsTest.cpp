@@ -62,7 +62,40 @@ protected:
     ScratchProject p;
 };
 
-TEST_F(CliItemCommands, AConflictIsExplainedAndAResourceChosenWithTheNameFollowing) {
+TEST_F(CliItemCommands, EachCommandAnswersRefusalsLeaveTheProjectAConflictIsExplainedAndMended) {
+    std::string saved = Slurp(p.path);
+    // A dialog whose answer cannot be read as what it should be fails, and changes nothing.
+    EXPECT_EQ(Item("DIO0", "run", {"select-resource"},
+                   {"select-resource:0=0", "select-resource:1=7", "select-resource:2=1"}),
+              1);
+    EXPECT_NE(Err().find("failed (status 0x80070057)"), std::string::npos) << Err();
+    EXPECT_NE(Out().find("0 still open"), std::string::npos) << Out();
+    EXPECT_EQ(Item("DIO0", "run", {"{00000000-0000-0000-0000-000000000001}"}), 1);
+    EXPECT_NE(Err().find("has no command"), std::string::npos);
+    EXPECT_EQ(Item("DIO0", "run", {"nonsense"}), 1);
+    EXPECT_EQ(Item("DIO0", "drop-check", {"T/Nowhere"}), 1);
+    EXPECT_EQ(Item("DIO0", "properties", {}, {}, {{"--set", "no equals sign"}}), 1);
+    EXPECT_EQ(Slurp(p.path), saved);
+    // Properties, help and the drop check.
+    ASSERT_EQ(Item("DIO0", "properties", {}, {}, {{"--set", "Direction=Output"}}), 0) << Err();
+    EXPECT_NE(Out().find("applied"), std::string::npos);
+    EXPECT_NE(Out().find("Direction"), std::string::npos); // the dialog was shown it
+    EXPECT_NE(ItemNamed("DIO0")["compileConfiguration"].get<std::string>().find("Direction=Output"),
+              std::string::npos);
+    // Closed without an answer: nothing to save.
+    saved = Slurp(p.path);
+    ASSERT_EQ(Item("DIO0", "properties"), 0) << Err();
+    EXPECT_NE(Out().find("nothing changed"), std::string::npos);
+    EXPECT_EQ(Slurp(p.path), saved);
+
+    ASSERT_EQ(Item("DIO0", "help"), 0) << Err();
+    EXPECT_NE(Out().find("path: /"), std::string::npos) << Out();
+    EXPECT_NE(Out().find("/help/board.chm\n"), std::string::npos) << Out();
+    EXPECT_NE(Out().find("topic: lines.html\n"), std::string::npos);
+
+    EXPECT_EQ(Item("DIO0", "drop-check", {"U"}), 0) << Err();
+    EXPECT_NE(Out().find("may be dropped under \"U\""), std::string::npos);
+    // A conflict is explained, and a resource chosen with the name following.
     ASSERT_EQ(Item("Backup", "menu"), 0) << Err();
     EXPECT_NE(Out().find("Select Resource...  {A117026A-AD51-4C63-8341-085C842D9F23}"),
               std::string::npos);
@@ -70,7 +103,7 @@ TEST_F(CliItemCommands, AConflictIsExplainedAndAResourceChosenWithTheNameFollowi
               std::string::npos);
 
     // The explanation names both items, and the user asks to be shown the one in the way.
-    const std::string saved = Slurp(p.path);
+    saved = Slurp(p.path);
     ASSERT_EQ(Item("Backup", "run", {"explain-error"}, {"explain-error:0=1"}), 0) << Err();
     EXPECT_NE(Out().find("the project tree selects and shows \"DIO0\""), std::string::npos);
     const size_t message = Out().find("8 = \"");
@@ -94,43 +127,6 @@ TEST_F(CliItemCommands, AConflictIsExplainedAndAResourceChosenWithTheNameFollowi
     EXPECT_EQ(moved["resource"], "/C0/DIO1");
     EXPECT_EQ(moved["status"], 0);
     EXPECT_EQ(ItemNamed("Backup")["status"], 0);
-}
-
-TEST_F(CliItemCommands, RefusalsLeaveTheProjectAsItWas) {
-    const std::string saved = Slurp(p.path);
-    // A dialog whose answer cannot be read as what it should be fails, and changes nothing.
-    EXPECT_EQ(Item("DIO0", "run", {"select-resource"},
-                   {"select-resource:0=0", "select-resource:1=7", "select-resource:2=1"}),
-              1);
-    EXPECT_NE(Err().find("failed (status 0x80070057)"), std::string::npos) << Err();
-    EXPECT_NE(Out().find("0 still open"), std::string::npos) << Out();
-    EXPECT_EQ(Item("DIO0", "run", {"{00000000-0000-0000-0000-000000000001}"}), 1);
-    EXPECT_NE(Err().find("has no command"), std::string::npos);
-    EXPECT_EQ(Item("DIO0", "run", {"nonsense"}), 1);
-    EXPECT_EQ(Item("DIO0", "drop-check", {"T/Nowhere"}), 1);
-    EXPECT_EQ(Item("DIO0", "properties", {}, {}, {{"--set", "no equals sign"}}), 1);
-    EXPECT_EQ(Slurp(p.path), saved);
-}
-
-TEST_F(CliItemCommands, PropertiesHelpAndDropCheck) {
-    ASSERT_EQ(Item("DIO0", "properties", {}, {}, {{"--set", "Direction=Output"}}), 0) << Err();
-    EXPECT_NE(Out().find("applied"), std::string::npos);
-    EXPECT_NE(Out().find("Direction"), std::string::npos); // the dialog was shown it
-    EXPECT_NE(ItemNamed("DIO0")["compileConfiguration"].get<std::string>().find("Direction=Output"),
-              std::string::npos);
-    // Closed without an answer: nothing to save.
-    const std::string saved = Slurp(p.path);
-    ASSERT_EQ(Item("DIO0", "properties"), 0) << Err();
-    EXPECT_NE(Out().find("nothing changed"), std::string::npos);
-    EXPECT_EQ(Slurp(p.path), saved);
-
-    ASSERT_EQ(Item("DIO0", "help"), 0) << Err();
-    EXPECT_NE(Out().find("path: /"), std::string::npos) << Out();
-    EXPECT_NE(Out().find("/help/board.chm\n"), std::string::npos) << Out();
-    EXPECT_NE(Out().find("topic: lines.html\n"), std::string::npos);
-
-    EXPECT_EQ(Item("DIO0", "drop-check", {"U"}), 0) << Err();
-    EXPECT_NE(Out().find("may be dropped under \"U\""), std::string::npos);
 }
 
 } // namespace

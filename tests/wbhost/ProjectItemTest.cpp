@@ -39,7 +39,7 @@ protected:
     IwbProjectItem& root = project->Root();
 };
 
-TEST_F(ProjectItemTest, TreeOperations) {
+TEST_F(ProjectItemTest, TreeOperationsAndPropertiesThatAreTypedAndAnswerFalseWhenAbsent) {
     auto folder = Child(root, u"Folder");
     auto inner = Child(*folder.Get(), u"Inner");
     IwbProjectItem* found = nullptr;
@@ -71,6 +71,33 @@ TEST_F(ProjectItemTest, TreeOperations) {
     EXPECT_EQ(folder->FindChild(u"Renamed", &found), S_FALSE);
     // Duplicate names are the plug-in's business: the host accepts them.
     EXPECT_TRUE(Child(root, u"folder"));
+    // Properties are typed, and an absent one answers S_FALSE.
+    IwbProjectPropertyBag* bag = nullptr;
+    ASSERT_EQ(root.GetPropertyBag(&bag), S_OK);
+    BSTR text = reinterpret_cast<BSTR>(1);
+    int32_t number = 7;
+    EXPECT_EQ(bag->GetString(u"missing", &text), S_FALSE);
+    EXPECT_EQ(text, nullptr);
+    EXPECT_EQ(bag->GetInt(u"missing", &number), S_FALSE);
+    EXPECT_EQ(number, 0);
+    EXPECT_EQ(bag->GetBool(u"", &number), E_INVALIDARG);
+
+    EXPECT_EQ(bag->SetString(u"empty", nullptr, 0), S_OK);
+    EXPECT_EQ(bag->GetString(u"empty", &text), S_OK); // present, though empty
+    EXPECT_EQ(SysStringLen(text), 0u);
+    SysFreeString(text);
+    bag->SetInt(u"n", INT32_MIN, 0);
+    EXPECT_EQ(bag->GetInt(u"n", &number), S_OK);
+    EXPECT_EQ(number, INT32_MIN);
+    bag->SetBool(u"b", 42, 0);
+    EXPECT_EQ(bag->GetBool(u"b", &number), S_OK);
+    EXPECT_EQ(number, 1);
+    // Names are exact, and a read of another kind is refused rather than called absent.
+    EXPECT_EQ(bag->GetInt(u"N", &number), S_FALSE);
+    EXPECT_EQ(bag->GetString(u"n", &text), E_INVALIDARG);
+    bag->SetString(u"n", u"now text", 0);
+    EXPECT_EQ(StringOf(*bag, u"n"), u"now text");
+    bag->Release();
 }
 
 TEST_F(ProjectItemTest, InfoRecordAndObjectMap) {
@@ -111,35 +138,6 @@ TEST_F(ProjectItemTest, InfoRecordAndObjectMap) {
     record.size = 71;
     EXPECT_EQ(map->GetItemUI(&record, &object), E_INVALIDARG);
     map->Release();
-}
-
-TEST_F(ProjectItemTest, PropertiesAreTypedAndAbsentAnswersFalse) {
-    IwbProjectPropertyBag* bag = nullptr;
-    ASSERT_EQ(root.GetPropertyBag(&bag), S_OK);
-    BSTR text = reinterpret_cast<BSTR>(1);
-    int32_t number = 7;
-    EXPECT_EQ(bag->GetString(u"missing", &text), S_FALSE);
-    EXPECT_EQ(text, nullptr);
-    EXPECT_EQ(bag->GetInt(u"missing", &number), S_FALSE);
-    EXPECT_EQ(number, 0);
-    EXPECT_EQ(bag->GetBool(u"", &number), E_INVALIDARG);
-
-    EXPECT_EQ(bag->SetString(u"empty", nullptr, 0), S_OK);
-    EXPECT_EQ(bag->GetString(u"empty", &text), S_OK); // present, though empty
-    EXPECT_EQ(SysStringLen(text), 0u);
-    SysFreeString(text);
-    bag->SetInt(u"n", INT32_MIN, 0);
-    EXPECT_EQ(bag->GetInt(u"n", &number), S_OK);
-    EXPECT_EQ(number, INT32_MIN);
-    bag->SetBool(u"b", 42, 0);
-    EXPECT_EQ(bag->GetBool(u"b", &number), S_OK);
-    EXPECT_EQ(number, 1);
-    // Names are exact, and a read of another kind is refused rather than called absent.
-    EXPECT_EQ(bag->GetInt(u"N", &number), S_FALSE);
-    EXPECT_EQ(bag->GetString(u"n", &text), E_INVALIDARG);
-    bag->SetString(u"n", u"now text", 0);
-    EXPECT_EQ(StringOf(*bag, u"n"), u"now text");
-    bag->Release();
 }
 
 TEST_F(ProjectItemTest, EnumerationStopsAtSelectionAndSkipsBelowScopes) {
@@ -187,7 +185,7 @@ TEST_F(ProjectItemTest, EnumerationStopsAtSelectionAndSkipsBelowScopes) {
     EXPECT_EQ(Walk(root), (std::vector<std::u16string>{u"A", u"S", u"B", u"Late"}));
 }
 
-TEST_F(ProjectItemTest, TargetsOfferTheirTreeAndHearItemChanges) {
+TEST_F(ProjectItemTest, TargetsOfferTheirTreeAndHearItemChangesRefusedObjectsDropTheirItem) {
     std::string error;
     auto target = project->AddTarget(u"Target", scratch.Write("t.xml", kDescription), &error);
     ASSERT_TRUE(target) << error;
@@ -224,9 +222,7 @@ TEST_F(ProjectItemTest, TargetsOfferTheirTreeAndHearItemChanges) {
     EXPECT_EQ(host->Changed().size(), 2u);
     EXPECT_EQ(host->SuspendedChanges(), 1);
     EXPECT_EQ(project->TargetOf(static_cast<wbhost::project::ProjectItem&>(*item.Get())), nullptr);
-}
-
-TEST_F(ProjectItemTest, RefusedObjectsDropTheItemAndClosingFreesCycles) {
+    // Refused objects drop the item, and closing frees cycles.
     const long before = qv::com::LiveObjectCount();
     {
         wbhost::resources::ResourceService own;

@@ -45,7 +45,7 @@ protected:
     size_t live = 0;
 };
 
-TEST_F(RuntimePath, TextsAreNormalisedAndSplit) {
+TEST_F(RuntimePath, TextsAreNormalisedAndSplitBadStaleAndForeignPathsGetHostErrors) {
     WBPath path = nullptr;
     ASSERT_EQ(FTextToPath("/a//b/c.gx/", 11, &path), kWBNoErr);
     EXPECT_EQ(Text(path), "/a/b/c.gx");
@@ -85,10 +85,8 @@ TEST_F(RuntimePath, TextsAreNormalisedAndSplit) {
         EXPECT_EQ(FDestroyPath(held), kWBNoErr);
         EXPECT_EQ(*held, nullptr);
     }
-}
-
-TEST_F(RuntimePath, BadTextsStaleAndForeignPathsGetHostErrors) {
-    WBPath path = nullptr;
+    // Bad texts, stale and foreign paths get host errors.
+    path = nullptr;
     EXPECT_EQ(FTextToPath("abc", -1, &path), kWBArgErr);
     EXPECT_EQ(FTextToPath("a\0b", 3, &path), kWBArgErr);
     EXPECT_EQ(path, nullptr);
@@ -102,7 +100,7 @@ TEST_F(RuntimePath, BadTextsStaleAndForeignPathsGetHostErrors) {
     WBPath foreign = reinterpret_cast<WBPath>(&notAPath);
     EXPECT_EQ(FTextToPath("x", 1, &foreign), kWBArgErr);
     EXPECT_EQ(notAPath, 0);
-    const char* name = nullptr;
+    name = nullptr;
     EXPECT_EQ(FNamePtr(kept, &name), kWBArgErr);
     EXPECT_EQ(FDirName(kept, &path), kWBArgErr);
     EXPECT_EQ(FPathToPath(kept, &path), kWBArgErr);
@@ -116,7 +114,7 @@ TEST_F(RuntimePath, BadTextsStaleAndForeignPathsGetHostErrors) {
     EXPECT_EQ(FGetSpecialDir(3, &path), kWBArgErr);
 }
 
-TEST_F(RuntimePath, HostFolderIsTheExecutablesFolderAndIsExported) {
+TEST_F(RuntimePath, HostFolderIsTheExecutablesAndCopyMoveRemoveRefuseToOverwriteOrMiss) {
     WBPath folder = nullptr;
     ASSERT_EQ(FGetSpecialDir(kWBHostFolder, &folder), kWBNoErr);
     EXPECT_EQ(fs::path(Text(folder)), fs::canonical("/proc/self/exe").parent_path());
@@ -137,9 +135,7 @@ TEST_F(RuntimePath, HostFolderIsTheExecutablesFolderAndIsExported) {
         EXPECT_NE(dlsym(self, name), nullptr) << name;
     }
     dlclose(self);
-}
-
-TEST_F(RuntimePath, CopyMoveAndRemoveRefuseToOverwriteOrMissFiles) {
+    // Copy, move and remove refuse to overwrite or miss files.
     fs::create_directories(dir / "sub");
     std::ofstream(dir / "a.txt") << "alpha";
     const HeldPath a((dir / "a.txt").string());

@@ -64,7 +64,7 @@ void ClearCache(const rt::BoundFunction<AnswerFn>& function) {
     throw std::runtime_error(message);
 }
 
-TEST_F(HostFunctionTest, EachModuleGetsItsOwnEntryAndKeepsIt) {
+TEST_F(HostFunctionTest, EachModuleGetsItsOwnEntryAndKeepsItWhileTheThreadSlotDecidesIfItHoldsOne) {
     static rt::BoundFunction<AnswerFn> answer{"FakeAnswer"};
     ClearCache(answer);
     const auto fakes = LoadFakes(1, 2);
@@ -77,11 +77,7 @@ TEST_F(HostFunctionTest, EachModuleGetsItsOwnEntryAndKeepsIt) {
     EXPECT_EQ(cache.slots[0].stamp.load(), ModuleStamp(fakes[0].handle()));
     EXPECT_EQ(cache.slots[1].module.load(), fakes[1].handle());
     EXPECT_EQ(cache.slots[2].stamp.load(), 0u);
-}
-
-TEST_F(HostFunctionTest, ThreadSlotDecidesOnlyWhenItHoldsAModule) {
-    static rt::BoundFunction<AnswerFn> answer{"FakeAnswer"};
-    const auto fakes = LoadFakes(1, 2);
+    // The thread slot decides only when it holds a module.
     pthread_key_t key;
     ASSERT_EQ(pthread_key_create(&key, nullptr), 0);
     rt::SetRuntimeTlsIndex(static_cast<uint32_t>(key));
