@@ -41,7 +41,7 @@ protected:
     ComPtr<IwbhwResourceTreeNode> line_;
 };
 
-TEST_F(ReservationTest, TheFirstItemHoldsItTheNextTakesOverOnlySharedModeNoNulls) {
+TEST_F(ReservationTest, TheFirstItemHoldsItTheNextTakesOverUntilTheNodeGoesOnlySharedModeNoNulls) {
     const auto first = test::NewItem();
     const auto second = test::NewItem();
     auto observer = test::NewObserver();
@@ -66,15 +66,13 @@ TEST_F(ReservationTest, TheFirstItemHoldsItTheNextTakesOverOnlySharedModeNoNulls
     EXPECT_EQ(observer->heard.back().events, 0x40u);
     EXPECT_EQ(line_->ReleaseReservation(second.Get()), S_OK);
     EXPECT_EQ(IsReserved(nullptr), 0u);
-    const auto item = test::NewItem();
+    auto item = test::NewItem();
     EXPECT_EQ(line_->Reserve(item.Get(), 1), E_NOTIMPL);
     EXPECT_EQ(line_->Reserve(nullptr, 3), E_POINTER);
     EXPECT_EQ(line_->QueryReservation(item.Get()), S_FALSE);
     EXPECT_EQ(line_.As<IwbhwResourceReservation>()->IsReserved(nullptr, 0, nullptr), E_POINTER);
-}
-
-TEST_F(ReservationTest, RemovingTheNodeLetsItsHoldersGo) {
-    auto item = test::NewItem();
+    // Removing the node lets its holders go.
+    item = test::NewItem();
     ASSERT_EQ(line_->Reserve(item.Get(), 3), S_OK);
     IwbProjectItem* raw = item.Get();
     raw->AddRef();

@@ -8,11 +8,10 @@
 #include "runner/RunnerService.h"
 #include "runner/UniqueName.h"
 #include "runtime/Runtime.h"
+#include "support/ScratchFolder.h"
 
 #include <filesystem>
-#include <fstream>
 #include <gtest/gtest.h>
-#include <unistd.h>
 
 namespace {
 
@@ -143,39 +142,24 @@ TEST(RunnerProgramFile, KeysAreTrimmedAndCommentsSkipped) {
     EXPECT_FALSE(ParseProgramFile(": unique-name\nbehaviour: unique-name\n"));
 }
 
-TEST_F(RunnerProgram, MissingAndMalformedProgramsDoNotOpen) {
+TEST_F(RunnerProgram, MissingAndMalformedProgramsDoNotOpenAndHostReferencesItemsAndIconsAnswer) {
     ComPtr<IwbProgram> program;
     EXPECT_EQ(runner->OpenProgram(u"/nonexistent/TIOGenUniqueName.gx", program.Put()),
               static_cast<HRESULT>(0x80070002));
     EXPECT_FALSE(program);
     EXPECT_EQ(runner->OpenProgram(nullptr, program.Put()), E_POINTER);
 
-    const auto dir =
-        std::filesystem::temp_directory_path() / ("runner-test-" + std::to_string(getpid()));
-    std::filesystem::create_directories(dir);
-    const std::pair<const char*, const char*> files[] = {
-        {"unknown.gx", "behaviour: launch-rockets\n"},
-        {"nobehaviour.gx", "# nothing\ntitle: x\n"},
-        {"garbage.gx", "behaviour: unique-name\nnot a key line\n"},
+    const test::ScratchFolder dir;
+    const auto open = [&](const std::string& path) {
+        return runner->OpenProgram(std::u16string(path.begin(), path.end()).c_str(), program.Put());
     };
-    for (const auto& [name, text] : files) {
-        std::ofstream(dir / name) << text;
-        const std::string path = (dir / name).string();
-        EXPECT_EQ(
-            runner->OpenProgram(std::u16string(path.begin(), path.end()).c_str(), program.Put()),
-            E_FAIL)
-            << name;
-    }
-    // A directory is not a program either.
-    const std::string dirText = dir.string();
-    EXPECT_EQ(
-        runner->OpenProgram(std::u16string(dirText.begin(), dirText.end()).c_str(), program.Put()),
-        E_FAIL);
-    std::filesystem::remove_all(dir);
+    for (const auto& [name, text] : {std::pair{"unknown.gx", "behaviour: launch-rockets\n"},
+                                     {"nobehaviour.gx", "# nothing\ntitle: x\n"},
+                                     {"garbage.gx", "behaviour: unique-name\nnot a key line\n"}})
+        EXPECT_EQ(open(dir.Write(name, text)), E_FAIL) << name;
+    EXPECT_EQ(open(dir.Path()), E_FAIL); // a directory is not a program either
     EXPECT_TRUE(session->Runs().empty());
-}
-
-TEST_F(RunnerProgram, HostReferencesItemsAndIcons) {
+    // Host references, items and icons.
     auto item = test::NewItem();
     uint64_t reference = 0;
     ASSERT_EQ(runner->MakeHostReference(item.Get(), &reference), S_OK);

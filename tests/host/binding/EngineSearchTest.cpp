@@ -2,11 +2,12 @@
 // are skipped.
 #include "host/binding/EngineSearch.h"
 
+#include "support/ScratchFolder.h"
+
 #include <filesystem>
 #include <fstream>
 #include <gtest/gtest.h>
 #include <map>
-#include <unistd.h>
 
 namespace fs = std::filesystem;
 namespace rt = qv::host::rt;
@@ -16,10 +17,6 @@ namespace {
 class EngineSearchTest : public ::testing::Test {
 protected:
     void SetUp() override {
-        root_ = fs::temp_directory_path() /
-                ("hostrt_search_" + std::to_string(getpid()) + "_" +
-                 ::testing::UnitTest::GetInstance()->current_test_info()->name());
-        fs::remove_all(root_);
         fs::create_directories(root_ / "bin");
         env_.executablePath = (root_ / "bin" / "host.exe").string();
         env_.variable = [this](const std::string& name) -> std::optional<std::string> {
@@ -27,8 +24,6 @@ protected:
             return it == variables_.end() ? std::nullopt : std::optional(it->second);
         };
     }
-    void TearDown() override { fs::remove_all(root_); }
-
     std::string Path(const std::string& relative) const { return (root_ / relative).string(); }
     // Puts a library file at `relative`/libwbrt.so and answers its path.
     std::string PlaceLibrary(const std::string& relative) const {
@@ -45,7 +40,8 @@ protected:
                                      rt::EngineSearchRecord::ForKind(0, version), env_);
     }
 
-    fs::path root_;
+    const test::ScratchFolder scratch_;
+    const fs::path root_ = scratch_.Path();
     rt::EngineSearchEnvironment env_;
     std::map<std::string, std::string> variables_;
 };
@@ -88,7 +84,8 @@ TEST_F(EngineSearchTest, InstalledVersionsInTheirOrder) {
         << "a failed search gives the bare name";
 }
 
-TEST_F(EngineSearchTest, UnexpandedAndOverlongRootsAndDirectoriesNamedLikeTheLibraryAreSkipped) {
+TEST_F(EngineSearchTest,
+       OddRootsAndDirectoriesNamedLikeTheLibraryAreSkippedVersionlessSearchesStayNear) {
     fs::create_directories(root_ / "bin" / rt::kRunTimeEngineLibrary);
     EXPECT_FALSE(Find().found);
 
@@ -105,9 +102,7 @@ TEST_F(EngineSearchTest, UnexpandedAndOverlongRootsAndDirectoriesNamedLikeTheLib
     PlaceLibrary(longRoot + "/Quorvane/Shared/Wirebench Run-Time/16.0");
     variables_["ProgramFiles"] = Path(longRoot);
     EXPECT_FALSE(Find().found) << "expanded roots longer than 259 characters are not tried";
-}
-
-TEST_F(EngineSearchTest, WithoutAVersionOnlyTheProfileAndExecutableFolderAreSearched) {
+    // Without a version only the profile and the executable's folder are searched.
     variables_["ProgramFiles"] = Path("pf");
     PlaceLibrary("pf/Quorvane/Shared/Wirebench Run-Time");
     EXPECT_FALSE(Find("").found);

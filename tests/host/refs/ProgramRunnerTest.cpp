@@ -3,10 +3,9 @@
 
 #include "com/ComObject.h"
 #include "host/contracts/IwbProgramRunnerService.h"
+#include "support/ScratchFolder.h"
 
 #include <cstdio>
-#include <filesystem>
-#include <fstream>
 #include <gtest/gtest.h>
 
 namespace {
@@ -66,7 +65,7 @@ protected:
     ComPtr<CQVComObject<FakeRoot>> root_;
 };
 
-TEST_F(ProgramRunnerTest, OnlyAnExistingFileIsOpenedAndTheRunnersStatusAnswered) {
+TEST_F(ProgramRunnerTest, OnlyAnExistingFileIsOpenedAndHostReferencesGoBackThroughTheRunner) {
     ComPtr<IwbProgram> program;
     ComPtr<IwbProgramRunner> runner;
     EXPECT_EQ(qv::host::runner::OpenHostProgram(root_->GetUnknown(),
@@ -79,21 +78,15 @@ TEST_F(ProgramRunnerTest, OnlyAnExistingFileIsOpenedAndTheRunnersStatusAnswered)
     EXPECT_EQ(
         qv::host::runner::OpenHostProgram(root_->GetUnknown(), u"", program.Put(), runner.Put()),
         E_FAIL);
-    const auto path = std::filesystem::temp_directory_path() / "wbt_runner_test.gx";
-    std::ofstream(path) << "program\n";
-    const std::string narrow = path.string();
+    const test::ScratchFolder scratch;
+    const std::string narrow = scratch.Write("p.gx", "program\n");
     const std::u16string wide(narrow.begin(), narrow.end());
     EXPECT_EQ(
         qv::host::runner::OpenHostProgram(root_->GetUnknown(), wide, program.Put(), runner.Put()),
         E_ACCESSDENIED);
     ASSERT_EQ(root_->runner->opened.size(), 1u);
     EXPECT_EQ(root_->runner->opened[0], wide);
-    std::filesystem::remove(path);
-}
-
-TEST_F(ProgramRunnerTest, HostReferencesAreReleasedThroughTheRunnerWhichNeedsARootWithTheService) {
-    ComPtr<IwbProgram> program;
-    ComPtr<IwbProgramRunner> runner;
+    // Host references are released through the runner, which needs a root with the service.
     // A provider asked before the framework gave it its root object.
     EXPECT_EQ(qv::host::runner::OpenHostProgram(nullptr, u"x", program.Put(), runner.Put()),
               E_POINTER);
