@@ -4,13 +4,13 @@
 #include "runtime/HostStrings.h"
 #include "runtime/PathTable.h"
 #include "runtime/Runtime.h"
+#include "support/ScratchFolder.h"
 
 #include <cstring>
 #include <dlfcn.h>
 #include <filesystem>
 #include <fstream>
 #include <gtest/gtest.h>
-#include <unistd.h>
 
 namespace {
 
@@ -38,10 +38,10 @@ class RuntimePath : public ::testing::Test {
 protected:
     void SetUp() override { live = PathTable::Instance().LiveCount(); }
     void TearDown() override {
-        fs::remove_all(dir);
         EXPECT_EQ(PathTable::Instance().LiveCount(), live) << "a path was not released";
     }
-    const fs::path dir = fs::temp_directory_path() / ("runtime-path-" + std::to_string(getpid()));
+    const test::ScratchFolder scratch;
+    const fs::path dir = scratch.Path();
     size_t live = 0;
 };
 

@@ -6,11 +6,11 @@
 #include "host/binding/ConnectionList.h"
 #include "host/binding/VersionName.h"
 #include "host/binding/WBCIntFunctions.h"
+#include "support/ScratchFolder.h"
 
 #include <array>
 #include <filesystem>
 #include <gtest/gtest.h>
-#include <unistd.h>
 
 namespace fs = std::filesystem;
 namespace rt = qv::host::rt;
@@ -79,7 +79,8 @@ TEST(EngineConnection, OpensStartsAndClosesThroughTheTableNamedOnesFromRevisionF
 }
 
 TEST(EngineConnection, InstalledEnginesAreFoundUnderTheShortenedVersionExplicitDirectoriesAsGiven) {
-    const fs::path root = fs::temp_directory_path() / ("hostrt_engine_" + std::to_string(getpid()));
+    const test::ScratchFolder scratch;
+    const fs::path root = scratch.Path();
     const fs::path versionDir = root / "pf/Quorvane/Shared/Wirebench Run-Time/16.0";
     fs::create_directories(versionDir);
     fs::create_directories(root / "bin");
@@ -97,7 +98,6 @@ TEST(EngineConnection, InstalledEnginesAreFoundUnderTheShortenedVersionExplicitD
     EXPECT_EQ(connection->kind(), rt::kRunTimeEngine);
     connection.reset();
     EXPECT_EQ(rt::OpenEngineConnection(rt::kRunTimeEngine, "17.0f1", "", env), nullptr);
-    fs::remove_all(root);
     // An explicit directory is used as given; kind two needs an existing executable.
     const rt::EngineSearchEnvironment bare;
     const std::string directory = fs::path(hostrt_test::FakeWbrtPath()).parent_path().string();

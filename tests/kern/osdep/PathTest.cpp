@@ -2,13 +2,13 @@
 #include "kern/osdep/Path.h"
 
 #include "kern/osdep/OSException.h"
+#include "support/ScratchFolder.h"
 
 #include <dlfcn.h>
 #include <filesystem>
 #include <fstream>
 #include <gtest/gtest.h>
 #include <unicode/ucol.h>
-#include <unistd.h>
 
 namespace fs = std::filesystem;
 using qv::kern::osdep::FindFiles;
@@ -52,16 +52,15 @@ TEST(OsPath, ClosedModuleHasNoDirectory) {
 class FindFilesTest : public ::testing::Test {
 protected:
     void SetUp() override {
-        dir_ = fs::temp_directory_path() / ("kern_find_" + std::to_string(getpid()));
         fs::create_directories(dir_ / "sub.gx");
         for (const char* name : {"a.gx", "b.GX", "c.txt", "[x].gx", ".hidden.gx", "noext"})
             std::ofstream(dir_ / name) << "x";
     }
-    void TearDown() override { fs::remove_all(dir_); }
     std::string In(const char* pattern) const { return (dir_ / pattern).string(); }
     std::string Dir() const { return dir_.string() + "/"; }
 
-    fs::path dir_;
+    const test::ScratchFolder scratch_;
+    const fs::path dir_ = scratch_.Path();
 };
 
 TEST_F(FindFilesTest, WildcardsMatchTheLastComponentAndNothingFoundIsAnEmptyList) {
