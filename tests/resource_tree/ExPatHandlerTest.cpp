@@ -32,7 +32,7 @@ public:
 const std::string kDoc = "<a Name='x' b='\xC3\xA9'>t\xF0\x9F\x98\x80<c/></a>";
 const std::u16string kExpected = u"<a b=\u00E9 Name=x>t\U0001F600<c></c></a>";
 
-TEST(ExPatHandler, DeliversWideEventsWholeOrOneByteAtATime) {
+TEST(ExPatHandler, DeliversWideEventsWholeOrBytewiseRethrowsHandlerExceptionsAndReportsErrors) {
     Recorder whole;
     ASSERT_TRUE(whole.Parse(kDoc, true));
     EXPECT_EQ(whole.log, kExpected);
@@ -42,9 +42,6 @@ TEST(ExPatHandler, DeliversWideEventsWholeOrOneByteAtATime) {
         ASSERT_TRUE(bytewise.Parse(std::string_view(&c, 1), false));
     ASSERT_TRUE(bytewise.Parse({}, true));
     EXPECT_EQ(bytewise.log, kExpected);
-}
-
-TEST(ExPatHandler, HandlerExceptionsAreRethrownAfterExpatReturnsErrorsWithLineAndColumn) {
     Recorder throwing;
     throwing.throwOnStart = true;
     EXPECT_THROW(throwing.Parse("<a><b/></a>", true), std::runtime_error);

@@ -19,7 +19,7 @@ using wbhost::runner::ProgramValue;
 
 namespace {
 
-TEST(CliAnswers, RefusesMisspeltBehavioursAndMalformedTextsWithoutSettingAnything) {
+TEST(CliAnswers, RefusesMalformedTextsAndBadFileLinesWithoutSettingAnythingSinglesOverride) {
     ProgramSession session;
     std::string error;
     // A behaviour nobody runs would be accepted by the session and never used.
@@ -47,15 +47,11 @@ TEST(CliAnswers, RefusesMisspeltBehavioursAndMalformedTextsWithoutSettingAnythin
     ASSERT_TRUE(AddAnswer("new-item-wizard:4=text:\xF0\x9F\x98\x80", session, error)) << error;
     EXPECT_EQ(session.AnswersFor("new-item-wizard").at(4),
               ProgramValue(std::u16string(u"\U0001F600")));
-}
-
-TEST(CliAnswers, FilesSkipCommentsAndBlanksNameTheBadLineAndSingleAnswersOverrideThem) {
+    // Files skip comments and blanks and name the bad line; single answers override them.
     ScratchFolder scratch;
     const std::string good =
         scratch.Write("good.txt", "# answers for the wizard\r\n\r\n  new-item-wizard:0=0  \r\n"
                                   "select-resource:1=text:Connector0/DIO1\n");
-    ProgramSession session;
-    std::string error;
     ASSERT_TRUE(LoadAnswerFile(good, session, error)) << error;
     EXPECT_EQ(session.AnswersFor("new-item-wizard").at(0), ProgramValue(0));
     // The carriage return of a Windows line end is not part of the text.

@@ -16,7 +16,7 @@ using wbhost::project::Property;
 
 namespace {
 
-TEST(CliAttributeSet, NewItemSetsReadBackWhateverTheNamesHoldNestedOnesNamedByPath) {
+TEST(CliAttributeSet, NewItemSetsReadBackWhateverTheNamesHoldNestedByPathOthersAreRefused) {
     for (const std::u16string name :
          {u"Valve", u"A/B/C", u"a&b <c> \"d\" 'e'", u"Ventil \u00e4\u20ac"}) {
         const auto read = ReadAttributeSet(NewItemAttributeSet(name, u"Connector0/DIO<1>&"));
@@ -32,6 +32,13 @@ TEST(CliAttributeSet, NewItemSetsReadBackWhateverTheNamesHoldNestedOnesNamedByPa
                          u"</AttributeSet></AttributeSet>");
     ASSERT_TRUE(read);
     EXPECT_EQ(*read, (std::vector<SetAttribute>{{u"resource", u"AI0"}, {u"/Scaling/Gain", u"2"}}));
+    // What is no attribute set is refused.
+    for (const std::u16string text :
+         {u"", u"resource=AI0", u"<AttributeSet name=\"\">", u"<Target><Line>1</Line></Target>",
+          u"<Attribute name=\"x\"><Value>1</Value></Attribute>"}) {
+        EXPECT_FALSE(ReadAttributeSet(text)) << wbhost::cli::ToUtf8(text);
+    }
+    EXPECT_EQ(ReadAttributeSet(u"<AttributeSet name=\"\"/>"), std::vector<SetAttribute>{});
 }
 
 // Sets as deep as the module reads are read; deeper ones fail instead of taking memory by the
@@ -52,15 +59,6 @@ TEST(CliAttributeSet, NestingIsBoundedAsTheModuleBoundsIt) {
     EXPECT_EQ(deepest->front().first.size(), 255u * 201u + 2u);
     EXPECT_FALSE(ReadAttributeSet(nested(257)));
     EXPECT_FALSE(ReadAttributeSet(nested(100000, 1)));
-}
-
-TEST(CliAttributeSet, RefusesWhatIsNoAttributeSet) {
-    for (const std::u16string text :
-         {u"", u"resource=AI0", u"<AttributeSet name=\"\">", u"<Target><Line>1</Line></Target>",
-          u"<Attribute name=\"x\"><Value>1</Value></Attribute>"}) {
-        EXPECT_FALSE(ReadAttributeSet(text)) << wbhost::cli::ToUtf8(text);
-    }
-    EXPECT_EQ(ReadAttributeSet(u"<AttributeSet name=\"\"/>"), std::vector<SetAttribute>{});
 }
 
 TEST(CliItemListing, ShowsStatusInWordsHiddenItemsAndOneLinePerProperty) {
