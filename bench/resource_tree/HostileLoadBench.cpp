@@ -2,7 +2,6 @@
 // chain of prototypes each copying the previous twice, siblings each naming 200,000 copies), and
 // repeated names lists merged under one node: time, heap held when the load stops, and the ratio
 // to a load of a real 1 MB target description in the same run.
-#include "resource_tree/BlockPool.h"
 #include "resource_tree/LoaderText.h"
 #include "resource_tree/ResTreeNode.h"
 
@@ -72,15 +71,13 @@ void RunLoad(benchmark::State& state, const std::u16string& text) {
     double total = 0;
     double heldMB = 0;
     for (auto _ : state) {
-        const size_t before = mallinfo2().uordblks + wbhw::BlockPool::BytesInUse();
+        const size_t before = mallinfo2().uordblks;
         const auto start = std::chrono::steady_clock::now();
         auto root = std::make_unique<wbhw::ResTreeNode>(wbhw::WString(), wbhw::WString(), false);
         benchmark::DoNotOptimize(root->ParseText(text, false));
         total += std::chrono::duration<double>(std::chrono::steady_clock::now() - start).count();
         state.PauseTiming();
-        heldMB =
-            static_cast<double>(mallinfo2().uordblks + wbhw::BlockPool::BytesInUse() - before) /
-            1e6;
+        heldMB = static_cast<double>(mallinfo2().uordblks - before) / 1e6;
         root.reset();
         state.ResumeTiming();
     }

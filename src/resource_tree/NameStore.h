@@ -2,7 +2,7 @@
 #pragma once
 
 #include "kern/StringBase.h"
-#include "resource_tree/BlockPool.h"
+#include "resource_tree/TreeArena.h"
 
 #include <cstdint>
 #include <deque>
@@ -30,7 +30,7 @@ public:
     };
 
     // SHARED false gives every entry a name of its own (what the address sanitizer wants).
-    explicit NameStore(bool shared = !WBT_BLOCK_POOL_BYPASS) noexcept : shared_(shared) {}
+    explicit NameStore(bool shared = !WBT_TREE_ARENA_BYPASS) noexcept : shared_(shared) {}
     NameStore(const NameStore&) = delete;
     NameStore& operator=(const NameStore&) = delete;
 

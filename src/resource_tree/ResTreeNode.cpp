@@ -3,6 +3,7 @@
 
 #include "kern/Collate.h"
 
+#include <memory>
 #include <utility>
 
 namespace wbhw {
@@ -37,6 +38,7 @@ bool MayNameDeferredContent(std::u16string_view name) noexcept {
 // A load makes one entry per element, and a comparison walks and frees them all again: every
 // byte of an entry is paid for in cache misses.
 static_assert(sizeof(ResTreeEntry) <= sizeof(WString) + 24, "an entry stays in its block size");
+static_assert(sizeof(ResTreeNode) <= TreeArena::kMaxBlock, "child nodes come from the arena");
 
 ResTreeEntry::ResTreeEntry(NameStore::Name& name, EntryKind kind) noexcept
     : name_(&name), keyAndKind_(name.key | static_cast<uint64_t>(kind)) {
@@ -68,6 +70,12 @@ ResTreeNode::ResTreeNode(WString name, WString type, bool ordered, ResTreeNode* 
       memory_(parent != nullptr ? parent->memory_ : ownMemory_.get()),
       list_(ArenaAllocator<ResTreeEntry>(&memory_->arena)),
       set_(EntryNameLess(), ArenaAllocator<ResTreeEntry>(&memory_->arena)) {}
+
+void ChildNodeDeleter::operator()(ResTreeNode* node) const noexcept {
+    ArenaAllocator<ResTreeNode> arena(&node->memory_->arena);
+    std::destroy_at(node);
+    arena.deallocate(node, 1);
+}
 
 ResTreeNode::~ResTreeNode() {
     index_.reset();
@@ -220,7 +228,17 @@ ResTreeNode::AddChildResult ResTreeNode::MakeChild(Position position, std::u16st
     const Position at = InsertEntry(position, name, EntryKind::Child, inserted, hinted);
     if (!inserted)
         return {at, at->child_.get(), false};
-    at->child_ = std::make_unique<ResTreeNode>(WString(name), std::move(type), ordered, this);
+    // Child nodes live in the tree's arena beside the entries, in the order the load makes them:
+    // a walk or a teardown goes from an entry to its node and on to the node's entries.
+    ArenaAllocator<ResTreeNode> arena(&memory_->arena);
+    ResTreeNode* const child = arena.allocate(1);
+    try {
+        std::construct_at(child, WString(name), std::move(type), ordered, this);
+    } catch (...) {
+        arena.deallocate(child, 1);
+        throw;
+    }
+    at->child_.reset(child);
     RaiseChanges(kChildAdded);
     return {at, at->child_.get(), true};
 }

@@ -35,6 +35,12 @@ inline bool IsTextKind(EntryKind kind) noexcept {
     return kind == EntryKind::Text || kind == EntryKind::LocalizedText;
 }
 
+// Destroys a child node and gives its block back to its tree's arena.
+struct ChildNodeDeleter {
+    void operator()(ResTreeNode* node) const noexcept;
+};
+using ChildNodePtr = std::unique_ptr<ResTreeNode, ChildNodeDeleter>;
+
 // One named entry of a node. Entries are changed only through their node.
 class ResTreeEntry {
 public:
@@ -70,7 +76,7 @@ private:
     // order key (in the bits the key leaves free), which keeps an entry in its block size.
     mutable uint64_t keyAndKind_;
     mutable WString text_;
-    mutable std::unique_ptr<ResTreeNode> child_;
+    mutable ChildNodePtr child_;
 };
 
 // -1, 0 or 1 as the names of two entries collate, without regard to case, in the user's locale.
@@ -137,6 +143,8 @@ private:
 // A resource-tree node. It owns its child nodes; the parent pointer never owns. Lookups report
 // absence with End() or null and never throw. Not locked: one thread uses a tree at a time.
 class ResTreeNode : private ResTreeNodeChangeObserver {
+    friend struct ChildNodeDeleter;
+
 public:
     using Position = ResTreePosition;
 

@@ -1,28 +1,39 @@
 // The memory of one resource tree's entries, and the allocator that hands it out.
 #pragma once
 
-#include "resource_tree/BlockPool.h"
-
 #include <array>
 #include <cstddef>
 #include <memory>
 #include <vector>
 
+// Under the address sanitizer every entry keeps its own heap block, so that a use after removal
+// is still caught.
+#if defined(__SANITIZE_ADDRESS__)
+#define WBT_TREE_ARENA_BYPASS 1
+#elif defined(__has_feature)
+#if __has_feature(address_sanitizer)
+#define WBT_TREE_ARENA_BYPASS 1
+#endif
+#endif
+#ifndef WBT_TREE_ARENA_BYPASS
+#define WBT_TREE_ARENA_BYPASS 0
+#endif
+
 namespace wbhw {
 
 // A load makes an entry for nearly every element; a comparison then walks both trees and frees
-// them. Taken from a pool shared by every tree, the entries of one tree lay wherever the last
-// teardown had left free blocks, and every step of a walk or a teardown waited for memory. Here
-// a tree's entries come from slabs of its own, one after another in the order the load makes
-// them (slabs double from 1 KB to 64 KB, so a small tree stays small), and go back all at once
-// with the tree. An entry removed earlier leaves its block for the next entry of that size, so a
-// tree edited for a long time holds no more blocks than it ever had entries at once. Under the
-// address sanitizer every block is a heap block of its own, so a use after removal is caught.
-// One thread uses a tree, and so its arena, at a time.
+// them. Taken from the general heap or from a pool shared by every tree, the entries of one tree
+// lay wherever the last teardown had left free blocks, and every step of a walk or a teardown
+// waited for memory. Here a tree's entries and child nodes come from slabs of its own, one after
+// another in the order the load makes them (slabs double from 1 KB to 64 KB, so a small tree stays
+// small), and go back all at once with the tree. An entry removed earlier leaves its block for the
+// next entry of that size, so a tree edited for a long time holds no more blocks than it ever had
+// entries at once. Under the address sanitizer every block is a heap block of its own, so a use
+// after removal is caught. One thread uses a tree, and so its arena, at a time.
 class TreeArena {
 public:
-    static constexpr size_t kGranule = BlockPool::kGranule;
-    static constexpr size_t kMaxBlock = BlockPool::kMaxBlock;
+    static constexpr size_t kGranule = 16;
+    static constexpr size_t kMaxBlock = 256;
 
     TreeArena() = default;
     TreeArena(const TreeArena&) = delete;
@@ -80,7 +91,7 @@ public:
 
 private:
     static constexpr bool Pooled(size_t n) noexcept {
-        return !WBT_BLOCK_POOL_BYPASS && n == 1 && sizeof(T) <= TreeArena::kMaxBlock &&
+        return !WBT_TREE_ARENA_BYPASS && n == 1 && sizeof(T) <= TreeArena::kMaxBlock &&
                alignof(T) <= TreeArena::kGranule;
     }
     TreeArena* arena_;
