@@ -136,8 +136,8 @@ void* ReclaimUnloaded(HostFunction& function, void* module,
     return nullptr;
 }
 
-void* ResolveIn(HostFunction& function, void* module) noexcept {
-    const ModuleIdentity identity = kern::osdep::IdentifyModule(module);
+// One look for an entry: a free or matching one, else one whose module has gone.
+void* ResolveOnce(HostFunction& function, void* module, const ModuleIdentity& identity) noexcept {
     if (void* const address = WalkCache(function, module, identity)) {
         return address;
     }
@@ -145,6 +145,39 @@ void* ResolveIn(HostFunction& function, void* module) noexcept {
         return address;
     }
     return WalkCache(function, module, identity);
+}
+
+// True when an entry is bound to this very load of MODULE.
+bool HoldsModule(const HostFunction& function, void* module,
+                 const ModuleIdentity& identity) noexcept {
+    for (const HostFunctionSlot& slot : function.slots) {
+        const SlotBinding binding = ReadSlot(slot);
+        if (binding.module == module && binding.base == identity.base &&
+            slot.stamp.load() == identity.stamp) {
+            return true;
+        }
+    }
+    return false;
+}
+
+// A look judges each entry at its own moment: while other threads load and unload modules, every
+// entry can hold a live module when it is looked at and yet one of them be gone a moment later.
+// A miss is therefore looked at again a few times before the cache counts as full, so that a
+// process never ends for want of an entry that was free all along.
+constexpr int kResolveAttempts = 16;
+
+void* ResolveIn(HostFunction& function, void* module) noexcept {
+    const ModuleIdentity identity = kern::osdep::IdentifyModule(module);
+    for (int attempt = 0; attempt < kResolveAttempts; ++attempt) {
+        if (void* const address = ResolveOnce(function, module, identity)) {
+            return address;
+        }
+        if (HoldsModule(function, module, identity)) {
+            return nullptr; // an entry answers: the module lacks the export
+        }
+        std::this_thread::yield();
+    }
+    return nullptr;
 }
 
 } // namespace
