@@ -107,6 +107,16 @@ protected:
         return refnums_.back();
     }
     std::u16string Resource(size_t item) { return ModuleProjectTest::Resource(items_[item]); }
+    // FN (an edit export) on the tree, or on ON, with host strings PATH and TEXT (none when
+    // null): its status and what it left in *FOUND, which starts as 7.
+    std::pair<HRESULT, uint8_t> Edit(EditFn* fn, const char* path, const char* text,
+                                     WBRefNum on = 0) {
+        uint8_t found = 7;
+        const WBRefNum refnum = on != 0 ? on : tree;
+        const HRESULT status = fn(&refnum, NewHostString(path).get(),
+                                  text != nullptr ? NewHostString(text).get() : nullptr, &found);
+        return {status, found};
+    }
 
     WBRefNum tree = 0;
     std::vector<ProjectItem*> items_;
@@ -174,49 +184,32 @@ TEST_F(ExportsOnAProject, EditsInsertRemoveAndSetPropertiesWhereThePathLeavesThe
     const WBRefNum item = AddItem(u"Late", u"/C0/DIO7");
     EXPECT_EQ(Resource(0), u"/C0/DIO7");
 
+    using Answer = std::pair<HRESULT, uint8_t>;
     // A part inserted under the connector: the item waiting for it binds.
-    uint8_t found = 7;
-    const auto line = NewHostString("<Line name=\"DIO7\"><Protocols>IOResource</Protocols></Line>");
-    ASSERT_EQ(insert(&tree, NewHostString("C0").get(), line.get(), &found), S_OK);
-    EXPECT_EQ(found, 1);
+    const char* const line = "<Line name=\"DIO7\"><Protocols>IOResource</Protocols></Line>";
+    ASSERT_EQ(Edit(insert, "C0", line), Answer(S_OK, 1));
     ASSERT_NE(Tree().Find(u"/C0/DIO7"), nullptr);
     EXPECT_EQ(Tree().QueryReservation(*Tree().Find(u"/C0/DIO7"), items_[0]), S_OK);
     // Under a path naming nothing, nothing is inserted; a document that does not load fails.
-    EXPECT_EQ(insert(&tree, NewHostString("C9").get(), line.get(), &found), S_OK);
-    EXPECT_EQ(found, 0);
-    EXPECT_EQ(insert(&tree, NewHostString("C0").get(), NewHostString("<Line").get(), &found),
-              E_FAIL);
-    EXPECT_EQ(found, 1);
+    EXPECT_EQ(Edit(insert, "C9", line), Answer(S_OK, 0));
+    EXPECT_EQ(Edit(insert, "C0", "<Line"), Answer(E_FAIL, 1));
 
     // The last piece of the path names no node: it is the property of the deepest node. An
     // existing text entry is changed the same way.
-    found = 0;
-    ASSERT_EQ(setProperty(&tree, NewHostString("C0/DIO0/Colour").get(), NewHostString("red").get(),
-                          &found),
-              S_OK);
-    EXPECT_EQ(found, 1);
+    ASSERT_EQ(Edit(setProperty, "C0/DIO0/Colour", "red"), Answer(S_OK, 1));
     EXPECT_EQ(Attribute(u"/C0/DIO0", u"Colour"), u"red");
-    ASSERT_EQ(setProperty(&tree, NewHostString("/C0/DIO0/Speed").get(), NewHostString("fast").get(),
-                          &found),
-              S_OK);
+    ASSERT_EQ(Edit(setProperty, "/C0/DIO0/Speed", "fast"), Answer(S_OK, 1));
     EXPECT_EQ(Attribute(u"/C0/DIO0", u"Speed"), u"fast");
     // Paths whose rest is no single property set nothing and say so: two pieces missing, a path
     // naming a node, a name of a child. *FOUND is written only at the end: a failure before it
     // leaves the caller's value.
-    for (const char* path : {"C0/DIO9/Colour", "C0/DIO0", "C0/DIO0/..", "C0"}) {
-        found = 7;
-        EXPECT_EQ(setProperty(&tree, NewHostString(path).get(), NewHostString("x").get(), &found),
-                  S_OK);
-        EXPECT_EQ(found, 0) << path;
-    }
+    for (const char* path : {"C0/DIO9/Colour", "C0/DIO0", "C0/DIO0/..", "C0"})
+        EXPECT_EQ(Edit(setProperty, path, "x"), Answer(S_OK, 0)) << path;
     EXPECT_EQ(Attribute(u"/C0", u"DIO9"), u"<none>");
-    found = 7;
-    EXPECT_EQ(setProperty(&item, NewHostString("C0/X").get(), nullptr, &found), E_NOINTERFACE);
-    EXPECT_EQ(found, 7);
+    EXPECT_EQ(Edit(setProperty, "C0/X", nullptr, item), Answer(E_NOINTERFACE, 7));
 
     // The part goes again: the item is missing its resource.
-    ASSERT_EQ(remove(&tree, NewHostString("C0").get(), NewHostString("DIO7").get(), &found), S_OK);
-    EXPECT_EQ(found, 1);
+    ASSERT_EQ(Edit(remove, "C0", "DIO7"), Answer(S_OK, 1));
     EXPECT_EQ(Tree().Find(u"/C0/DIO7"), nullptr);
     EXPECT_EQ(Status(items_[0]), 1);
 }

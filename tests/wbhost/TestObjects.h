@@ -1,5 +1,5 @@
 // COM objects that tests hand to the resource service: an observer that records what it hears
-// and a project item that only has an identity; and the text of a BSTR handed out.
+// and a project item of no project; and the text of a BSTR handed out.
 #pragma once
 
 #include "com/Bstr.h"
@@ -8,6 +8,7 @@
 #include "host/contracts/IwbProjectItem.h"
 #include "host/contracts/IwbhwResourceTreeNode.h"
 #include "host/contracts/IwbhwResourceTreeNodeObserver.h"
+#include "project/ProjectItem.h"
 
 #include <functional>
 #include <string>
@@ -56,34 +57,11 @@ inline qv::com::ComPtr<RecordingObserver> NewObserver() {
     return qv::com::ComPtr<RecordingObserver>::Adopt(made);
 }
 
-class StubItemImpl : public IwbProjectItem {
-public:
-    using Interfaces = qv::com::InterfaceList<IwbProjectItem>;
-    virtual ~StubItemImpl() = default;
-    HRESULT GetName(BSTR*) override { return E_NOTIMPL; }
-    HRESULT SetName(const char16_t*) override { return E_NOTIMPL; }
-    HRESULT GetTypeGuid(GUID*) override { return E_NOTIMPL; }
-    HRESULT GetParent(IwbProjectItem**) override { return E_NOTIMPL; }
-    HRESULT FindChild(const char16_t*, IwbProjectItem**) override { return E_NOTIMPL; }
-    HRESULT CreateChild(const GUID&, const char16_t*, IwbProjectItem**) override {
-        return E_NOTIMPL;
-    }
-    HRESULT GetObject(IUnknown**) override { return E_NOTIMPL; }
-    HRESULT GetPropertyBag(IwbProjectPropertyBag**) override { return E_NOTIMPL; }
-    HRESULT Refresh(uint32_t) override { return E_NOTIMPL; }
-    HRESULT Select() override { return E_NOTIMPL; }
-    HRESULT Show(int32_t) override { return E_NOTIMPL; }
-    HRESULT GetFlags(uint32_t*) override { return E_NOTIMPL; }
-    HRESULT SetFlags(uint32_t) override { return E_NOTIMPL; }
-    HRESULT EnumerateItems(IwbProjectItemSelector*, IwbProjectItem**) override { return E_NOTIMPL; }
-    HRESULT GetInfoRecord(QxItemInfoRecord*) override { return E_NOTIMPL; }
-    HRESULT GetItemUIMap(IwbProjectItemUIMap**) override { return E_NOTIMPL; }
-};
-using StubItem = CQVComObject<StubItemImpl>;
-
+// A host project item of no project: an identity to reserve with or to hand out.
 inline qv::com::ComPtr<IwbProjectItem> NewItem() {
-    StubItem* made = nullptr;
-    StubItem::CreateInstance(&made);
+    wbhost::project::ProjectItemObject* made = nullptr;
+    wbhost::project::ProjectItemObject::CreateInstance(&made, nullptr, GUID_NULL, GUID_NULL,
+                                                       u"item");
     return qv::com::ComPtr<IwbProjectItem>::Adopt(made);
 }
 
