@@ -49,7 +49,7 @@ TEST(AttrBagXml, WritesExactLinesWithTrimmedEscapedValuesAndReadsNestedSets) {
     EXPECT_EQ(last, target.ResolvePath(u"/A/B/"));
 }
 
-TEST(AttrBagXml, TopLevelSetReplacesTheChildOfThatNameUnexpectedDocumentsKeepWhatWasRead) {
+TEST(AttrBagXml, TopLevelSetsReplaceTheirChildBadDocumentsKeepWhatWasReadNestingIsBounded) {
     TIOAttrBag target;
     target.GetOrCreateChild(u"A").SetValue(u"old", u"1");
     target.GetOrCreateChild(u"P");
@@ -82,9 +82,7 @@ TEST(AttrBagXml, TopLevelSetReplacesTheChildOfThatNameUnexpectedDocumentsKeepWha
                                   kept),
               kFail);
     EXPECT_EQ(kept.GetValue(u"kept"), u"k");
-}
-
-TEST(AttrBagXml, NestingIsBoundedAndOneUnencodableCharacterDoesNotLoseTheBag) {
+    // Nesting is bounded, and one unencodable character does not lose the bag.
     auto nested = [](int depth) {
         std::u16string doc;
         for (int i = 0; i < depth; ++i)
@@ -99,12 +97,12 @@ TEST(AttrBagXml, NestingIsBoundedAndOneUnencodableCharacterDoesNotLoseTheBag) {
     EXPECT_EQ(TIOAttrBag::ReadXml(nested(100000), tooDeep), kFail);
     // Under a top-level set with a parent the target is one level more: what was read must
     // still read back once written out from the target.
-    TIOAttrBag target;
+    TIOAttrBag fresh;
     const std::u16string doc = nested(TIOAttrBagParser::kMaxNesting);
-    EXPECT_EQ(TIOAttrBag::ReadXml(u"<AttributeSet name='p' parent='/'>" + doc.substr(23), target),
+    EXPECT_EQ(TIOAttrBag::ReadXml(u"<AttributeSet name='p' parent='/'>" + doc.substr(23), fresh),
               kFail);
     std::u16string written;
-    target.WriteXml(written);
+    fresh.WriteXml(written);
     TIOAttrBag again;
     EXPECT_EQ(TIOAttrBag::ReadXml(written, again), 0);
     TIOAttrBag bag(u"r");

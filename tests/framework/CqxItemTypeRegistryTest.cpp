@@ -30,7 +30,8 @@ private:
     int id_;
 };
 
-TEST(CqxItemTypeRegistry, AnyTypeRequestWalksKeyOrderUntilOneCreatesOrAnswersTheLastAttempt) {
+TEST(CqxItemTypeRegistry,
+     RequestsWalkKeyOrderAndTypesAreListedInKeyOrderNamedByLiteralsOrResources) {
     std::vector<int> log;
     CqxItemTypeRegistry registry;
     registry.Insert(kHigh, std::make_unique<ScriptedInfo>(S_OK, &log, 3));
@@ -55,21 +56,18 @@ TEST(CqxItemTypeRegistry, AnyTypeRequestWalksKeyOrderUntilOneCreatesOrAnswersThe
     EXPECT_EQ(empty.Create(CqxItemRequest{}, &item), E_OUTOFMEMORY);
     empty.Insert(kHigh, std::make_unique<ScriptedInfo>(E_ABORT, &log, 3));
     EXPECT_EQ(empty.Create(CqxItemRequest{}, &item), E_ABORT);
-}
-
-TEST(CqxItemTypeRegistry, ListsTypesAndParentsInKeyOrderNamedByLiteralsOrStringResources) {
-    std::vector<int> log;
-    CqxItemTypeRegistry registry;
-    registry.Insert(kHigh, std::make_unique<ScriptedInfo>(S_OK, &log, 3));
-    registry.Insert(kLow, std::make_unique<ScriptedInfo>(S_OK, &log, 1, GUID_NULL, kCategory));
-    registry.Insert(GUID_NULL, std::make_unique<ScriptedInfo>(S_OK, &log, 0, GUID_NULL, kMid));
+    // Types and parent types are listed in key order.
+    CqxItemTypeRegistry listed;
+    listed.Insert(kHigh, std::make_unique<ScriptedInfo>(S_OK, &log, 3));
+    listed.Insert(kLow, std::make_unique<ScriptedInfo>(S_OK, &log, 1, GUID_NULL, kCategory));
+    listed.Insert(GUID_NULL, std::make_unique<ScriptedInfo>(S_OK, &log, 0, GUID_NULL, kMid));
     std::vector<GUID> types;
-    registry.ListTypes(types);
+    listed.ListTypes(types);
     ASSERT_EQ(types.size(), 2u); // a GUID_NULL key with a parent type is left out
     EXPECT_TRUE(IsEqualGUID(types[0], kLow));
     EXPECT_TRUE(IsEqualGUID(types[1], kHigh));
     std::vector<GUID> parents;
-    registry.ListParentTypes(parents);
+    listed.ListParentTypes(parents);
     ASSERT_EQ(parents.size(), 2u);
     EXPECT_TRUE(IsEqualGUID(parents[0], kMid));
     EXPECT_TRUE(IsEqualGUID(parents[1], kCategory));
@@ -79,11 +77,9 @@ TEST(CqxItemTypeRegistry, ListsTypesAndParentsInKeyOrderNamedByLiteralsOrStringR
     names.SetTypeNameLiteral(kLow, u"Tangent IO");
     names.SetTypeNameResource(kMid, 42);
     const auto load = [](uint32_t id, std::u16string& text) {
-        if (id != 42) {
-            return false;
-        }
-        text = u"forty-two";
-        return true;
+        if (id == 42)
+            text = u"forty-two";
+        return id == 42;
     };
     BSTR name = nullptr;
     ASSERT_EQ(names.TypeName(kLow, load, &name), S_OK);

@@ -12,7 +12,7 @@ using qv::kern::GuidToString;
 using qv::kern::StringToGuid;
 using qv::kern::exception::BadGuidString;
 
-TEST(GuidText, ParsesOnlyTheBracedFormAndWritesUpperCase) {
+TEST(GuidText, ParsesOnlyTheBracedFormWritesUpperCaseOrdersByFieldsAndMakesVersionFour) {
     const Guid g = StringToGuid(u"{a117026a-ad51-4c63-8341-085c842e9d22}");
     EXPECT_EQ(g.Data1, 0xA117026Au);
     EXPECT_EQ(g.Data2, 0xAD51u);
@@ -35,9 +35,7 @@ TEST(GuidText, ParsesOnlyTheBracedFormAndWritesUpperCase) {
         u"{a117026a-ad51-4c63-8341-085c842e9d2\uFF12}", u""};
     for (const char16_t* text : bad)
         EXPECT_THROW(StringToGuid(std::u16string_view(text)), BadGuidString);
-}
-
-TEST(GuidText, OrdersByFieldsThenBytesAndNewOnesAreRandomVersionFour) {
+    // GUIDs order by fields, then bytes; new ones are random, version four.
     const Guid a = StringToGuid(u"{00000001-FFFF-FFFF-FFFF-FFFFFFFFFFFF}");
     const Guid b = StringToGuid(u"{00000002-0000-0000-0000-000000000000}");
     const Guid c = StringToGuid(u"{00000002-0000-0000-0000-000000000001}");

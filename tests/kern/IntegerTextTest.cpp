@@ -9,7 +9,7 @@ using qv::kern::IntegerToString;
 using qv::kern::StringToInteger;
 using qv::kern::exception::UnableToConvert;
 
-TEST(IntegerText, WritesUpperCaseDigitsInAnyBaseAndReadsThemBack) {
+TEST(IntegerText, WritesUpperCaseDigitsInAnyBaseAndReadsThemBackStrictlyOrNotButNeverOverflowing) {
     EXPECT_EQ(IntegerToString(255, 16), u"FF");
     EXPECT_EQ(IntegerToString(0, 10), u"0");
     EXPECT_EQ(IntegerToString(0xFFFFFFFFu, 2), std::u16string(32, u'1'));
@@ -23,9 +23,8 @@ TEST(IntegerText, WritesUpperCaseDigitsInAnyBaseAndReadsThemBack) {
             EXPECT_EQ(StringToInteger(IntegerToString(value, base), base, nullptr, true), value);
         }
     }
-}
-
-TEST(IntegerText, ReadsSkippingSpaceNotingTheSignStrictAboutTrailingTextAndOverflow) {
+    // Reading skips space, notes the sign, is strict about trailing text on request and never
+    // overflows.
     bool minus = true;
     EXPECT_THROW(StringToInteger(u"12x", 10, &minus, true), UnableToConvert);
     EXPECT_EQ(StringToInteger(u"12x", 10, &minus, false), 12u);

@@ -32,7 +32,7 @@ public:
 const std::string kDoc = "<a Name='x' b='\xC3\xA9'>t\xF0\x9F\x98\x80<c/></a>";
 const std::u16string kExpected = u"<a b=\u00E9 Name=x>t\U0001F600<c></c></a>";
 
-TEST(ExPatHandler, DeliversWideEventsWholeOrBytewiseRethrowsHandlerExceptionsAndReportsErrors) {
+TEST(ExPatHandler, DeliversWideEventsWholeOrBytewiseDecodesLenientlyRethrowsAndReportsErrors) {
     Recorder whole;
     ASSERT_TRUE(whole.Parse(kDoc, true));
     EXPECT_EQ(whole.log, kExpected);
@@ -51,9 +51,7 @@ TEST(ExPatHandler, DeliversWideEventsWholeOrBytewiseRethrowsHandlerExceptionsAnd
     EXPECT_EQ(r.CurrentLine(), 2u);
     EXPECT_EQ(r.CurrentColumn(), 7u);
     EXPECT_FALSE(r.ErrorString().empty());
-}
-
-TEST(LoaderText, WellFormedTextsComeBackFromUtf8Unchanged) {
+    // Well-formed texts come back from UTF-8 unchanged.
     std::u16string text = u"prefix ";
     text += std::u16string(100, u'a') + u"\u00E9\U0001F600 tail";
     EXPECT_EQ(wbhw::FromUtf8Lenient(qv::kern::WideToStandardUtf8(text)), text);

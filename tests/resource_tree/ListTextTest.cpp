@@ -8,7 +8,7 @@ namespace {
 
 using Pieces = std::vector<std::u16string>;
 
-TEST(ListText, SplitsOnlyAtUnescapedSeparatorsAndEscapingRoundTrips) {
+TEST(ListText, SplitsOnlyAtUnescapedSeparatorsEscapesRoundTripAndRelativePathsClimbLittle) {
     EXPECT_EQ(SplitListText(u"", u',', true), Pieces{});
     EXPECT_EQ(SplitListText(u"a,", u',', false), (Pieces{u"a", u""}));
     // One backslash escapes the comma; two are an escaped backslash before a real separator.
@@ -22,9 +22,7 @@ TEST(ListText, SplitsOnlyAtUnescapedSeparatorsAndEscapingRoundTrips) {
         EXPECT_EQ(SplitListText(escaped, u'/', false), Pieces{text}) << escaped.size();
         EXPECT_EQ(UnescapeListText(escaped, u'/'), text);
     }
-}
-
-TEST(ListText, RelativePathsClimbOnlyWhatTheyMust) {
+    // Relative paths climb only what they must.
     EXPECT_EQ(RelativeResourcePath(u"/a/b", u"/a/c"), u"../c");
     EXPECT_EQ(RelativeResourcePath(u"/a/b", u"/a/b"), u"");
     EXPECT_EQ(RelativeResourcePath(u"/a/b", u"/a"), u"..");

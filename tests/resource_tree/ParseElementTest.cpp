@@ -8,7 +8,7 @@ namespace wbhw {
 namespace {
 using namespace test;
 
-TEST(ParseElement, LinksStoreThePathFromTheirNodeOrSayUnresolvedAndKeepTheDocumentWhole) {
+TEST(ParseElement, LinksStoreTheirPathOrSayUnresolvedAndLocalizedTextsPickTheLanguage) {
     auto root = Load(uR"(<Top>
         <Group name="a"><Group name="pin"/></Group>
         <Group name="b">
@@ -56,9 +56,7 @@ TEST(ParseElement, LinksStoreThePathFromTheirNodeOrSayUnresolvedAndKeepTheDocume
     EXPECT_EQ(TextOf(*root, u"Later"), u"2");
     EXPECT_NE(TextOf(*b, u"XMLParseErrors").find(u"Child elements of a :Link element are ignored"),
               std::u16string::npos);
-}
-
-TEST(ParseElement, LocalizedTextsPickTheLanguageAndKeepTheList) {
+    // Localized texts pick the language and keep the list.
     const std::u16string doc = uR"(<Top>
         <Label localize="true">eng=Input, deu=Eingang , fra = Entree</Label>
         <Other localize="1">fra=Sortie</Other>

@@ -149,22 +149,20 @@ TEST(ParseStack, XmlPathAndReferenceTextsAreNormalOnlyTheTextInsideALeafIsGather
     EXPECT_EQ(TextOf(*g, u"Blank"), u"");
 }
 
-TEST(ParseStack, SyntaxErrorsAccumulateWithLineColumnAndContext) {
-    ResTreeNode root(u"", u"", false);
+TEST(ParseStack, SyntaxErrorsAccumulateInContextDeepNestingStopsTheLoadTextKeepsEveryPlane) {
+    ResTreeNode parsed(u"", u"", false);
     const std::u16string bad = u"<Top>\n<A>1</A>\n<B>\n</Top>\n";
-    EXPECT_EQ(root.ParseText(bad, false), kFail);
-    const std::u16string first = TextOf(root, u"XMLParseErrors");
+    EXPECT_EQ(parsed.ParseText(bad, false), kFail);
+    const std::u16string first = TextOf(parsed, u"XMLParseErrors");
     EXPECT_EQ(first, u"Error on line 4 at column 2\n   mismatched tag\n   \n<B>\n</Top>\n\n");
     // The entries made before the error stay.
-    EXPECT_EQ(TextOf(root, u"A"), u"1");
-    EXPECT_EQ(root.ParseText(u"<Top><", false), kFail);
-    const std::u16string both = TextOf(root, u"XMLParseErrors");
+    EXPECT_EQ(TextOf(parsed, u"A"), u"1");
+    EXPECT_EQ(parsed.ParseText(u"<Top><", false), kFail);
+    const std::u16string both = TextOf(parsed, u"XMLParseErrors");
     EXPECT_EQ(both.substr(0, first.size()), first);
     EXPECT_EQ(both.substr(first.size()),
               u"Error on line 1 at column 5\n   unclosed token\n   <Top><\n");
-}
-
-TEST(ParseStack, TextInputKeepsCharactersBeyondTheBasicPlaneAndDeepNestingStopsTheLoad) {
+    // Text input keeps characters beyond the basic plane; deep nesting stops the load.
     auto root = Load(u"<Top><V>\U0001F600\u00E9</V></Top>");
     EXPECT_EQ(TextOf(*root, u"V"), u"\U0001F600\u00E9");
     int32_t result = 0;

@@ -98,20 +98,18 @@ TEST(ResTreeNode, LargeOrderedNodesFindTheFirstOfEachNameAsAScanWould) {
     EXPECT_GT(node.EntryCount(), 30u);
 }
 
-TEST(ResTreeNode, TextsAreSetOnlyOnTextEntries) {
-    ResTreeNode root(u"", u"Target", false);
-    EXPECT_TRUE(root.SetText(u"Value", u"1"));
-    EXPECT_EQ(*root.TextAt(u"value"), u"1");
-    EXPECT_TRUE(root.SetText(u"VALUE", u"2"));
-    EXPECT_EQ(*root.TextAt(u"Value"), u"2");
-    root.AddLink(root.End(), u"l", u"");
-    EXPECT_FALSE(root.SetTextAt(root.Find(u"l"), u"x"));
-    EXPECT_FALSE(root.SetTextAt(root.End(), u"x"));
-    EXPECT_EQ(root.TextAt(u"l"), nullptr);
-    EXPECT_EQ(root.TextAt(u"missing"), nullptr);
-}
-
-TEST(ResTreeNode, PathsEscapeSlashesResolveFromAnAnchorOrTheNodeThroughLinksAndLoopsEndInNull) {
+TEST(ResTreeNode, TextsAreSetOnTextEntriesOnlyPathsResolveThroughAnchorsAndLinksReservesInOrder) {
+    ResTreeNode texts(u"", u"Target", false);
+    EXPECT_TRUE(texts.SetText(u"Value", u"1"));
+    EXPECT_EQ(*texts.TextAt(u"value"), u"1");
+    EXPECT_TRUE(texts.SetText(u"VALUE", u"2"));
+    EXPECT_EQ(*texts.TextAt(u"Value"), u"2");
+    texts.AddLink(texts.End(), u"l", u"");
+    EXPECT_FALSE(texts.SetTextAt(texts.Find(u"l"), u"x"));
+    EXPECT_FALSE(texts.SetTextAt(texts.End(), u"x"));
+    EXPECT_EQ(texts.TextAt(u"l"), nullptr);
+    EXPECT_EQ(texts.TextAt(u"missing"), nullptr);
+    // Paths escape slashes and resolve back, from an anchor or the node itself.
     ResTreeNode top(u"top", u"Target", false);
     ResTreeNode* ab = top.AddChild(top.End(), u"a/b", u"Module", false).node;
     ResTreeNode* leaf = ab->AddChild(ab->End(), u"c\\d", u"IOResource", false).node;
@@ -150,13 +148,11 @@ TEST(ResTreeNode, PathsEscapeSlashesResolveFromAnAnchorOrTheNodeThroughLinksAndL
     links.AddLink(links.End(), u"q", u"p");
     EXPECT_EQ(links.NodeAt(links.Find(u"self")), nullptr);
     EXPECT_EQ(links.ResolvePath(u"p/x"), nullptr);
-}
-
-TEST(ResTreeNode, ReservedNodesFollowTheListInOrder) {
-    ResTreeNode root(u"", u"Target", false);
-    ResTreeNode* a = root.AddChild(root.End(), u"a", u"IOResource", false).node;
-    ResTreeNode* b = root.AddChild(root.End(), u"b", u"IOResource", false).node;
-    ResTreeNode* user = root.AddChild(root.End(), u"user", u"IOResource", false).node;
+    // Reserved nodes follow the list in order.
+    ResTreeNode owner(u"", u"Target", false);
+    ResTreeNode* a = owner.AddChild(owner.End(), u"a", u"IOResource", false).node;
+    ResTreeNode* b = owner.AddChild(owner.End(), u"b", u"IOResource", false).node;
+    ResTreeNode* user = owner.AddChild(owner.End(), u"user", u"IOResource", false).node;
     user->SetText(u"Reserves", u" ../b , ../missing,../a ");
     EXPECT_EQ(user->ReservedNodes(true), (std::vector<ResTreeNode*>{b, a}));
     user->RemoveByName(u"Reserves");

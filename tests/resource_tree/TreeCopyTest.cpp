@@ -56,7 +56,7 @@ TEST(TreeCopy, NamesListsMixNamesAndRangesCopyingTheFirstNodeCappedOrSkippedWhen
     EXPECT_EQ(root->Find(u"Inner"), root->End());
 }
 
-TEST(TreeCopy, PrototypesAreCopiedThenOverriddenUnlessTheyHoldTheNewNodeOrAreGone) {
+TEST(TreeCopy, PrototypesAndVariablesAreCopiedWithinBudgetUnlessAPrototypeHoldsTheNewNode) {
     auto root = Load(uR"(<Top>
         <Group name="other"/>
         <Group name="proto"><A>1</A><B>#{kind}</B><Group name="sub"><C>c</C></Group>
@@ -97,10 +97,8 @@ TEST(TreeCopy, PrototypesAreCopiedThenOverriddenUnlessTheyHoldTheNewNodeOrAreGon
     EXPECT_EQ(TextOf(*a, u"X"), u"<absent>");
     EXPECT_EQ(TextOf(*a, u"Y"), u"2");
     EXPECT_TRUE(HasError(*root, u"Unable to find prototype node: a/p"));
-}
-
-TEST(TreeCopy, VariablesComeFromOpenElementsOutermostFirstAndCopiesStayWithinBudget) {
-    auto root = Load(uR"(<Top vendor="outer" board="b1">
+    // Variables come from open elements, outermost first; copies stay within the entry budget.
+    root = Load(uR"(<Top vendor="outer" board="b1">
         <Group name="g" vendor="inner" rev="2">
             <Text>#{vendor}-#{board}-#{rev}-#{missing}-#{name}-#{document-root}-#{unclosed</Text>
         </Group>

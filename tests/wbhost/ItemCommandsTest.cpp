@@ -13,6 +13,7 @@
 #include "project/DragData.h"
 #include "runtime/HostFolder.h"
 
+#include <algorithm>
 #include <gtest/gtest.h>
 
 using namespace projecttest;
@@ -83,12 +84,11 @@ protected:
     // The last run of BEHAVIOUR.
     ProgramRun LastRun(const std::string& behaviour) {
         const auto runs = Programs().Runs();
-        for (auto run = runs.rbegin(); run != runs.rend(); ++run) {
-            if (run->behaviour == behaviour)
-                return *run;
-        }
-        ADD_FAILURE() << "no run of " << behaviour;
-        return {};
+        const auto run = std::find_if(runs.rbegin(), runs.rend(), [&](const ProgramRun& r) {
+            return r.behaviour == behaviour;
+        });
+        EXPECT_NE(run, runs.rend()) << "no run of " << behaviour;
+        return run != runs.rend() ? *run : ProgramRun{};
     }
     size_t OpenReferences() { return session.Programs().Ledger().Counts().open; }
     // Whether REFERENCE (a runner's host reference) was made for ITEM.

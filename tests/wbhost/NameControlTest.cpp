@@ -108,8 +108,7 @@ TEST_F(NameControlTest, ListsTheResourcesThatFitOrAPlaceholderAndQueriesCheckTar
     BSTR* categories = nullptr;
     ASSERT_EQ(names->ListCategories(&count, &categories), S_OK);
     ASSERT_EQ(count, 1u);
-    EXPECT_EQ(qv::com::BstrToString(categories[0]), u"FPGA IO");
-    SysFreeString(categories[0]);
+    EXPECT_EQ(TakeText(categories[0]), u"FPGA IO");
     CoTaskMemFree(categories);
 
     int32_t status = -1;

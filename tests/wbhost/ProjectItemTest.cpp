@@ -84,8 +84,7 @@ TEST_F(ProjectItemTest, TreeOperationsAndPropertiesThatAreTypedAndAnswerFalseWhe
 
     EXPECT_EQ(bag->SetString(u"empty", nullptr, 0), S_OK);
     EXPECT_EQ(bag->GetString(u"empty", &text), S_OK); // present, though empty
-    EXPECT_EQ(SysStringLen(text), 0u);
-    SysFreeString(text);
+    EXPECT_EQ(TakeText(text), u"");
     bag->SetInt(u"n", INT32_MIN, 0);
     EXPECT_EQ(bag->GetInt(u"n", &number), S_OK);
     EXPECT_EQ(number, INT32_MIN);

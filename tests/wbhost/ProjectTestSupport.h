@@ -75,9 +75,7 @@ inline std::u16string ItemBag(std::u16string_view resource) {
 inline std::u16string NameOf(IwbProjectItem* item) {
     BSTR name = nullptr;
     item->GetName(&name);
-    std::u16string text = qv::com::BstrToString(name);
-    SysFreeString(name);
-    return text;
+    return test::TakeText(name);
 }
 
 using test::TakeText;

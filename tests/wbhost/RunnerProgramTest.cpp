@@ -61,10 +61,8 @@ std::vector<std::u16string> ReadList(IwbProgram* program, uint32_t index) {
     uint32_t count = 99;
     EXPECT_EQ(program->GetOutputStringList(index, &array, &count), S_OK);
     std::vector<std::u16string> result;
-    for (uint32_t i = 0; i < count; ++i) {
-        result.push_back(qv::com::BstrToString(array[i]));
-        SysFreeString(array[i]);
-    }
+    for (uint32_t i = 0; i < count; ++i)
+        result.push_back(test::TakeText(array[i]));
     CoTaskMemFree(array);
     return result;
 }

@@ -70,7 +70,7 @@ TEST(RuntimeVariant, OneNameOneAttributeOfAnyKindNestedOnesReadAsCopies) {
     WbVariantDestroy(element);
 }
 
-TEST(RuntimeVariant, ElementsOfAZeroFilledHostArrayAreVariantsOnFirstUse) {
+TEST(RuntimeVariant, ElementsOfAZeroFilledArrayAreVariantsOnFirstUseLyingOnesGetHostErrors) {
     const size_t live = wbhost::runtime::VariantTable::Instance().LiveCount();
     // A name list as modules prepare it: a count, padding, then one variant slot per element.
     WBHandle list = DSNewHClr(8 + 8 * 2);
@@ -98,9 +98,7 @@ TEST(RuntimeVariant, ElementsOfAZeroFilledHostArrayAreVariantsOnFirstUse) {
     EXPECT_EQ(WbVariantDestroy(slot(0)), kWBArgErr);
     DSDisposeHandle(list);
     EXPECT_EQ(wbhost::runtime::VariantTable::Instance().LiveCount(), live);
-}
-
-TEST(RuntimeVariant, LyingStringsAndStaleHandlesGetHostErrors) {
+    // Lying strings and stale handles get host errors.
     WBVariant variant = WbVariantCreate();
     const Name name("n");
     WBHandle value = nullptr;

@@ -33,7 +33,7 @@ uint32_t BuildIdPrefixOnDisk(const std::string& path) {
     return 0;
 }
 
-TEST(DynamicModule, StampIsTheBuildIdPrefixAndDiffersBetweenBuilds) {
+TEST(DynamicModule, StampsAreBuildIdPrefixesAndClosedOrFailedModulesKeepNoReference) {
     DynamicModule one(hostrt_test::FakePath(1));
     DynamicModule two(hostrt_test::FakePath(2));
     ASSERT_TRUE(one && two);
@@ -43,9 +43,7 @@ TEST(DynamicModule, StampIsTheBuildIdPrefixAndDiffersBetweenBuilds) {
     EXPECT_NE(ModuleStamp(one.handle()), ModuleStamp(two.handle()));
     EXPECT_NE(ModuleStamp(MainModule()), 0u);
     EXPECT_EQ(ModuleStamp(nullptr), 1u);
-}
-
-TEST(DynamicModule, ClosedOrFailedModulesAreNotLoadedAndKeepNoReference) {
+    // A closed or failed module is not loaded and keeps no reference.
     DynamicModule wbrt(hostrt_test::FakeWbrtPath());
     ASSERT_TRUE(wbrt) << wbrt.error();
     void* const handle = wbrt.handle();

@@ -27,7 +27,7 @@ std::string MessageOf(void (*raise)()) {
     return "(nothing raised)";
 }
 
-TEST(ThrowIfWBError, RaisesNonZeroCodesWithItsOwnLocationAndCopiesKeepIt) {
+TEST(ThrowIfWBError, RaisesNonZeroCodesWithItsLocationAndHostArrayChecksRaiseOnBoundsAndSizes) {
     EXPECT_NO_THROW(ThrowIfWBError(0));
     try {
         ThrowIfWBError(53);
@@ -43,9 +43,7 @@ TEST(ThrowIfWBError, RaisesNonZeroCodesWithItsOwnLocationAndCopiesKeepIt) {
         EXPECT_EQ(copy.line(), error.line());
         EXPECT_STREQ(copy.what(), error.what());
     }
-}
-
-TEST(HostArrayChecks, BoundsAndSizes) {
+    // Host array checks raise on bounds and sizes.
     EXPECT_NO_THROW(CheckArrayIndex(2, 3));
     EXPECT_EQ(MessageOf([] { CheckArrayIndex(3, 3); }),
               "Error Code: 1 (00000001): Array index out of bounds.");

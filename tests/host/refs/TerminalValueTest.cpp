@@ -21,7 +21,7 @@ template <class T> T Stored(NumericClass cls, double value) {
     return result;
 }
 
-TEST(TerminalValue, IntegersTruncateTowardsZeroKeepTheLowBytesOrAreIndefinite) {
+TEST(TerminalValue, EachNumericClassStoresItsOwnWayAndOthersLeaveTheDataAlone) {
     EXPECT_EQ(Stored<uint8_t>(NumericClassOfTypeCode(5), 300.0), 44);
     EXPECT_EQ(Stored<int8_t>(NumericClass::kI8, -2.9), -2);
     EXPECT_EQ(Stored<uint16_t>(NumericClass::kU16, -1.0), 0xFFFF);
@@ -38,9 +38,7 @@ TEST(TerminalValue, IntegersTruncateTowardsZeroKeepTheLowBytesOrAreIndefinite) {
     EXPECT_EQ(Stored<int32_t>(NumericClass::kI32, 3e9), std::numeric_limits<int32_t>::min());
     EXPECT_EQ(Stored<int64_t>(NumericClass::kI64, -1e300), std::numeric_limits<int64_t>::min());
     EXPECT_EQ(Stored<uint8_t>(NumericClass::kU8, HUGE_VAL), 0);
-}
-
-TEST(TerminalValue, BooleansAreOneUnlessZeroFloatsTheNearestValueOthersLeaveTheDataAlone) {
+    // Booleans are one unless zero; floats take the nearest value of their width.
     const NumericClass boolean = NumericClassOfTypeCode(33);
     EXPECT_EQ(Stored<uint8_t>(boolean, -0.0), 0);
     EXPECT_EQ(Stored<uint8_t>(boolean, 0.0), 0);

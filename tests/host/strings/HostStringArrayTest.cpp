@@ -35,7 +35,7 @@ void Release(HostStringArray array) {
 
 constexpr const char kOutOfBounds[] = "Error Code: 1 (00000001): Array index out of bounds.";
 
-TEST(HostStringArray, AbsentArraysGrowIntoEmptyStringsShrinkingReleasesTheDroppedOnes) {
+TEST(HostStringArray, ArraysGrowIntoEmptyStringsShrinkByReleasingAndHostMadeOnesAreSafe) {
     HostStringArray array = nullptr;
     EXPECT_EQ(HostStringArrayCount(array), 0);
     EXPECT_EQ(Raised([&] { HostStringArrayElement(array, 0); }), kOutOfBounds);
@@ -73,9 +73,7 @@ TEST(HostStringArray, AbsentArraysGrowIntoEmptyStringsShrinkingReleasesTheDroppe
     EXPECT_EQ(ReadHostStringArray(array),
               (std::vector<std::string>{"a", "", std::string("b\0c", 3)}));
     Release(array);
-}
-
-TEST(HostStringArray, ArraysMadeByTheHostWithNullElementsOrABadCountAreHandledSafely) {
+    // Arrays made by the host with null elements or a bad count are handled safely.
     // Two elements that were never given strings.
     HostStringArray nulls = DSNewHClr(8 + 16);
     const int32_t two = 2;

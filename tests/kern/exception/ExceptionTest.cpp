@@ -21,7 +21,7 @@ template <class E> void ExpectTextAndCode(const char* text, uint32_t code) {
 
 } // namespace
 
-TEST(Exception, EachClassHasItsTextAndCodeAndThrowKeepsTheRaiseSiteAndDetail) {
+TEST(Exception, EachClassHasItsTextAndCodeThrowKeepsTheSiteAndRangeChecksRaise) {
     ExpectTextAndCode<ex::Exception>("unspecified exception", 0xFFFFFFFFu);
     ExpectTextAndCode<ex::OutOfRange>("Out of range", 0x8ABC7007u);
     ExpectTextAndCode<ex::InvalidArgument>("Invalid argument(s)", 0x8ABC700Fu);
@@ -48,9 +48,7 @@ TEST(Exception, EachClassHasItsTextAndCodeAndThrowKeepsTheRaiseSiteAndDetail) {
     }
     EXPECT_EQ(ex::Exception().file(), nullptr);
     EXPECT_EQ(ex::Exception().line(), 0u);
-}
-
-TEST(Exception, SubstringsBeyondTheEndAndProductsAbove32BitsRaise) {
+    // Substrings beyond the end and products above 32 bits raise.
     const qv::kern::WString s(u"abc");
     EXPECT_EQ(s.substr(3), u"");
     EXPECT_EQ(s.substr(1, 99), u"bc");

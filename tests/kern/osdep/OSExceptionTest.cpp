@@ -10,7 +10,7 @@
 using qv::kern::osdep::OSException;
 using qv::kern::osdep::WinError;
 
-TEST(OSException, WindowsCodesMapToHostCodesAndTheSystemsTextUnknownErrorAnd42ByDefault) {
+TEST(OSException, WindowsCodesAndErrnoMapToHostCodesAndTheSystemsTextCaughtAsTheBase) {
     const OSException e;
     EXPECT_STREQ(e.what(), "Unknown error");
     EXPECT_EQ(e.GetErrorCode(), 42u);
@@ -35,9 +35,7 @@ TEST(OSException, WindowsCodesMapToHostCodesAndTheSystemsTextUnknownErrorAnd42By
             EXPECT_STREQ(e.what(), row.text) << row.windowsCode;
         }
     }
-}
-
-TEST(OSException, LastErrorIsTheFailedCallsErrnoCaughtAsTheBaseOfTheTree) {
+    // The last error is the failed call's errno; caught as the base of the tree.
     ASSERT_EQ(::open("/nonexistent/dir/file", O_RDONLY), -1);
     const WinError notFound;
     EXPECT_EQ(notFound.GetOSErrorCode(), 2u);
