@@ -3,6 +3,7 @@
 // host confines it. Beside the directory lie files it must never read: a secret text, and links
 // inside it that lead to them. Nothing may crash or run away, and no secret may reach the tree
 // (its messages included) unless the input wrote it itself.
+#include "FuzzCheck.h"
 #include "FuzzSupport.h"
 #include "resource_tree/ResTreeWriter.h"
 
@@ -104,8 +105,15 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
     const bool asChild = (data[0] & 4) != 0;
     const int32_t result =
         root.ParseFile((Root() / "desc" / kParts[0]).string(), asChild, &out, &settings);
-    if ((result == 0) != (out != nullptr))
-        std::abort();
+    // A failure hands out no node. A success hands out the root itself, or, loaded as a child,
+    // the node the document element made: none when that element was only a text ("<Top/>"),
+    // and the root itself when it had no type yet, as the element then describes the root.
+    if (result != 0)
+        wbt::fuzz::Check(out == nullptr);
+    else if (!asChild)
+        wbt::fuzz::Check(out == &root);
+    else
+        wbt::fuzz::Check(out == nullptr || out == &root || out->Parent() == &root);
     if (wbhw::fuzz::CheckWithinBudget(root, settings) > wbhw::fuzz::kLargestWalkedTree)
         return 0;
     DeferredWalk walk(root);
