@@ -40,7 +40,10 @@ inline int CompareOrderKeys(size_t sizeA, uint64_t keyA, size_t sizeB, uint64_t 
 inline int CompareNoCaseKeyed(std::u16string_view a, uint64_t keyA, std::u16string_view b,
                               uint64_t keyB) noexcept {
     const int byKeys = CompareOrderKeys(a.size(), keyA, b.size(), keyB);
-    return byKeys != 2 ? byKeys : CompareNoCase(a, b);
+    if (byKeys != 2)
+        return byKeys;
+    // The same spelling is equal in every collation: paired names mostly are.
+    return a == b ? 0 : CompareNoCase(a, b);
 }
 
 // Strict weak order for maps and sorted containers keyed by names.

@@ -48,20 +48,10 @@ bool IsLocalized(const ResTreeEntry& entry) {
     return entry.Kind() == EntryKind::LocalizedText;
 }
 
-// The collator's order of two entries' names: most pairs are told by their order keys; where
-// the keys cannot tell, the same spelling still needs no collator.
-int CompareNames(const ResTreeEntry& x, const ResTreeEntry& y) {
-    const int byKeys =
-        qv::kern::CompareOrderKeys(x.Name().size(), x.NameKey(), y.Name().size(), y.NameKey());
-    if (byKeys != 2)
-        return byKeys;
-    return x.Name() == y.Name() ? 0 : qv::kern::CompareNoCase(x.Name(), y.Name());
-}
-
 // True when two entries at the same place of two ordered nodes take the same part in the
 // pairing: equal names, and both localized or neither.
 bool SameSlot(const ResTreeEntry& e, const ResTreeEntry& f) {
-    return IsLocalized(e) == IsLocalized(f) && CompareNames(e, f) == 0;
+    return IsLocalized(e) == IsLocalized(f) && CompareEntryNames(e, f) == 0;
 }
 
 // True when two entries are plain texts with the same text: such a pair matches under every
@@ -243,7 +233,7 @@ uint32_t CompareWalk::SortedEntries(ResTreeNode& a, ResTreeNode& b, Tally& tally
         // b's entries before E are passed over whether or not E takes part: an entry E would
         // skip is passed over by the next one that does, in the same order.
         int order = -1;
-        while (f != bEnd && (order = CompareNames(*f, *e)) < 0)
+        while (f != bEnd && (order = CompareEntryNames(*f, *e)) < 0)
             PassOver(b, *f++, tally);
         if (f == bEnd || order != 0) {
             if ((ClassOf(e->Name()) & kIgnoredName) != 0)

@@ -79,6 +79,13 @@ void* Bind(HostFunctionSlot& slot, const char* name, void* module,
     return Fill(slot, address, module, identity);
 }
 
+// True when the entry (read as BINDING) is bound to this very load of MODULE.
+bool BindsLoad(const HostFunctionSlot& slot, const SlotBinding& binding, void* module,
+               const ModuleIdentity& identity) noexcept {
+    return binding.module == module && binding.base == identity.base &&
+           slot.stamp.load() == identity.stamp;
+}
+
 // True when the entry's module is gone, or its handle now names another load (a handle is handed
 // out again after a dlclose): nobody can use the entry as it stands.
 bool IsStale(const HostFunctionSlot& slot, const SlotBinding& binding) noexcept {
@@ -118,7 +125,7 @@ void* ReclaimUnloaded(HostFunction& function, void* module,
     for (HostFunctionSlot& slot : function.slots) {
         const SlotBinding binding = ReadSlot(slot);
         void* const old = binding.module;
-        if (old == module && slot.stamp.load() == identity.stamp && binding.base == identity.base) {
+        if (BindsLoad(slot, binding, module, identity)) {
             return binding.address;
         }
         if (old == nullptr || !IsStale(slot, binding)) {
@@ -151,9 +158,7 @@ void* ResolveOnce(HostFunction& function, void* module, const ModuleIdentity& id
 bool HoldsModule(const HostFunction& function, void* module,
                  const ModuleIdentity& identity) noexcept {
     for (const HostFunctionSlot& slot : function.slots) {
-        const SlotBinding binding = ReadSlot(slot);
-        if (binding.module == module && binding.base == identity.base &&
-            slot.stamp.load() == identity.stamp) {
+        if (BindsLoad(slot, ReadSlot(slot), module, identity)) {
             return true;
         }
     }
