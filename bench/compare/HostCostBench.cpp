@@ -232,7 +232,7 @@ void BM_Parallel(benchmark::State& state) {
 
 BENCHMARK(BM_HostCost)->Arg(2000)->Iterations(15)->Unit(benchmark::kMillisecond);
 BENCHMARK(BM_HostCost)->Arg(16000)->Iterations(5)->Unit(benchmark::kMillisecond);
-BENCHMARK(BM_WalkOnly)->Arg(2000)->Unit(benchmark::kMillisecond);
+BENCHMARK(BM_WalkOnly)->Arg(2000)->Arg(16000)->Unit(benchmark::kMillisecond);
 BENCHMARK(BM_LongList)->Arg(10000)->Arg(40000)->Unit(benchmark::kMillisecond);
 BENCHMARK(BM_Repeats)->Arg(10000)->Arg(40000)->Unit(benchmark::kMillisecond);
 BENCHMARK(BM_Parallel)->Threads(1)->Threads(2)->UseRealTime()->MinTime(2.0);

@@ -27,6 +27,10 @@ constexpr std::u16string_view kDeferredLoadPath = u":DeferredLoadPath";
 // must still end.
 constexpr int kMaxDeferredRounds = 16;
 
+// A node with at least this many entries has its children walked with their memory asked for
+// ahead (ResTreeNode::PrefetchSubtree).
+constexpr size_t kLargeNode = 16;
+
 // What the rules make of a name (CompareWalk::ClassOf).
 constexpr uint8_t kIgnoredName = 1; // takes no part in the pairing
 constexpr uint8_t kLatencyName = 2; // "MemoryLatency": compared as a number
@@ -42,6 +46,17 @@ uint8_t ClassifyName(std::u16string_view name) {
     if (EqualsNoCase(name, kMemoryLatency))
         return kLatencyName;
     return EqualsNoCase(name, kSupportedValues) ? kListName : 0;
+}
+
+// The children of a large node are subtrees of a large tree, each most likely out of the cache,
+// and following the pointers through one waits for every line in turn. Asked for before the walk
+// reaches them, the memory of this pair of children and of the next arrives together.
+void PrefetchChildren(ResTreeNode::Position at, ResTreeNode::Position end) {
+    constexpr int kAhead = 2;
+    for (int i = 0; i < kAhead && at != end; ++i, ++at) {
+        if (const ResTreeNode* child = at->Child())
+            child->PrefetchSubtree();
+    }
 }
 
 bool IsLocalized(const ResTreeEntry& entry) {
@@ -227,7 +242,12 @@ uint32_t CompareWalk::Nodes(ResTreeNode* a, ResTreeNode* b) {
 uint32_t CompareWalk::SortedEntries(ResTreeNode& a, ResTreeNode& b, Tally& tally) {
     auto f = b.Begin();
     const auto bEnd = b.End();
+    const bool large = a.EntryCount() >= kLargeNode && b.EntryCount() >= kLargeNode;
     for (auto e = a.Begin(); e != a.End(); ++e) {
+        if (large) {
+            PrefetchChildren(e, a.End());
+            PrefetchChildren(f, bEnd);
+        }
         if (IsLocalized(*e))
             continue;
         // b's entries before E are passed over whether or not E takes part: an entry E would
@@ -263,7 +283,12 @@ uint32_t CompareWalk::SortedEntries(ResTreeNode& a, ResTreeNode& b, Tally& tally
 uint32_t CompareWalk::SequencedEntries(ResTreeNode& a, ResTreeNode& b, Tally& tally) {
     auto e = a.Begin();
     auto f = b.Begin();
+    const bool large = a.EntryCount() >= kLargeNode && b.EntryCount() >= kLargeNode;
     for (; e != a.End() && f != b.End() && SameSlot(*e, *f); ++e, ++f) {
+        if (large) {
+            PrefetchChildren(e, a.End());
+            PrefetchChildren(f, b.End());
+        }
         if (IsLocalized(*e) || SameText(*e, *f))
             continue;
         const uint8_t nameClass = ClassOf(e->Name());

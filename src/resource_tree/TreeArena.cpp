@@ -2,6 +2,7 @@
 #include "resource_tree/TreeArena.h"
 
 #include <algorithm>
+#include <cstdint>
 
 namespace wbhw {
 namespace {
@@ -32,6 +33,14 @@ void TreeArena::Release(void* block, size_t size) noexcept {
         return;
     FreeBlock*& reusable = free_[Rounded(size) / kGranule - 1];
     reusable = new (block) FreeBlock{reusable};
+}
+
+void TreeArena::Prefetch(const void* start, size_t bytes) noexcept {
+    constexpr size_t kLine = 64;
+    // Integer arithmetic, since the range may run past the object START points into.
+    const auto first = reinterpret_cast<uintptr_t>(start);
+    for (size_t offset = 0; offset < bytes; offset += kLine)
+        __builtin_prefetch(reinterpret_cast<const void*>(first + offset));
 }
 
 void TreeArena::NewSlab(size_t atLeast) {

@@ -45,6 +45,9 @@ public:
     void Release(void* block, size_t size) noexcept;
     // The tree is being torn down: its blocks all go with the arena, none is kept for reuse.
     void Close() noexcept { closed_ = true; }
+    // Asks the processor for BYTES of memory from START on, which a reader is about to need;
+    // touches nothing, so any address will do.
+    static void Prefetch(const void* start, size_t bytes) noexcept;
     // Bytes of the slabs. For measurements.
     size_t SlabBytes() const noexcept { return slabBytes_; }
 
