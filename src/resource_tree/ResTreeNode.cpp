@@ -62,14 +62,17 @@ ResTreePosition& ResTreePosition::operator++() noexcept {
 }
 
 ResTreeNode::ResTreeNode(WString name, WString type, bool ordered)
-    : ResTreeNode(std::move(name), std::move(type), ordered, nullptr) {}
+    : ResTreeNode(std::u16string_view(name), std::u16string_view(type), ordered, nullptr) {}
 
-ResTreeNode::ResTreeNode(WString name, WString type, bool ordered, ResTreeNode* parent)
-    : name_(std::move(name)), type_(std::move(type)), ordered_(ordered), parent_(parent),
+ResTreeNode::ResTreeNode(std::u16string_view name, std::u16string_view type, bool ordered,
+                         ResTreeNode* parent)
+    : ordered_(ordered), parent_(parent),
       ownMemory_(parent != nullptr ? nullptr : std::make_unique<TreeMemory>()),
       memory_(parent != nullptr ? parent->memory_ : ownMemory_.get()),
       list_(ArenaAllocator<ResTreeEntry>(&memory_->arena)),
-      set_(EntryNameLess(), ArenaAllocator<ResTreeEntry>(&memory_->arena)) {}
+      set_(EntryNameLess(), ArenaAllocator<ResTreeEntry>(&memory_->arena)) {
+    SetNameAndType(name, type);
+}
 
 void ChildNodeDeleter::operator()(ResTreeNode* node) const noexcept {
     ArenaAllocator<ResTreeNode> arena(&node->memory_->arena);
@@ -87,6 +90,8 @@ ResTreeNode::~ResTreeNode() {
     // Children unregister from this node while it is still whole.
     list_.clear();
     set_.clear();
+    NameStore::Release(*name_);
+    NameStore::Release(*type_);
 }
 
 ResTreeNode& ResTreeNode::Root() noexcept {
@@ -241,7 +246,7 @@ ResTreeNode::AddChildResult ResTreeNode::MakeChild(Position position, std::u16st
     ArenaAllocator<ResTreeNode> arena(&memory_->arena);
     ResTreeNode* const child = arena.allocate(1);
     try {
-        std::construct_at(child, WString(name), std::move(type), ordered, this);
+        std::construct_at(child, name, std::u16string_view(type), ordered, this);
     } catch (...) {
         arena.deallocate(child, 1);
         throw;
@@ -434,9 +439,18 @@ void ResTreeNode::SetOrdered(bool ordered) {
     ordered_ = ordered;
 }
 
-void ResTreeNode::SetNameAndType(WString name, WString type) {
-    name_ = std::move(name);
-    type_ = std::move(type);
+void ResTreeNode::SetNameAndType(std::u16string_view name, std::u16string_view type) {
+    // Both are taken before the old ones go: either may be spelled by the old ones.
+    NameStore::Name& newName = memory_->names.Intern(name);
+    NameStore::AddUse(newName);
+    NameStore::Name& newType = memory_->names.Intern(type);
+    NameStore::AddUse(newType);
+    if (name_ != nullptr)
+        NameStore::Release(*name_);
+    if (type_ != nullptr)
+        NameStore::Release(*type_);
+    name_ = &newName;
+    type_ = &newType;
 }
 
 void ResTreeNode::MarkInUse() noexcept {

@@ -161,16 +161,17 @@ public:
     // A root node; ORDERED chooses a sequence (true) or a name-sorted map (false) of entries.
     ResTreeNode(WString name, WString type, bool ordered);
     // A child node of PARENT (the caller's entry in PARENT owns it).
-    ResTreeNode(WString name, WString type, bool ordered, ResTreeNode* parent);
+    ResTreeNode(std::u16string_view name, std::u16string_view type, bool ordered,
+                ResTreeNode* parent);
     // Unregisters from the nodes it watches, tells its watchers, then deletes its subtree.
     ~ResTreeNode() override;
     ResTreeNode(const ResTreeNode&) = delete;
     ResTreeNode& operator=(const ResTreeNode&) = delete;
 
     // The node's name, the last piece of its path.
-    const WString& Name() const noexcept { return name_; }
+    const WString& Name() const noexcept { return name_->spelling; }
     // The node's type (the tag that declared it).
-    const WString& Type() const noexcept { return type_; }
+    const WString& Type() const noexcept { return type_->spelling; }
     // True when entries keep their insertion order (duplicates allowed), false when sorted.
     bool IsOrdered() const noexcept { return ordered_; }
     // The parent node; null for a root.
@@ -298,7 +299,7 @@ public:
     // node keeps the first of several same-named entries).
     void SetOrdered(bool ordered);
     // Renames the node and sets its type (the loader does this for an untyped root only).
-    void SetNameAndType(WString name, WString type);
+    void SetNameAndType(std::u16string_view name, std::u16string_view type);
     // True while a running load holds this node or one below it; such nodes are not removed.
     bool IsInUse() const noexcept { return useCount_ != 0; }
     // Marks this node and its ancestors as used by a load; UnmarkInUse undoes it.
@@ -351,8 +352,10 @@ private:
     };
     using NameIndex = std::map<std::u16string_view, IndexedName, qv::kern::LessNoCase>;
 
-    WString name_;
-    WString type_;
+    // In the tree's name store, as entry names are: a node's name is its entry's, and a few
+    // types serve a whole description.
+    NameStore::Name* name_ = nullptr;
+    NameStore::Name* type_ = nullptr;
     bool ordered_;
     bool mayDefer_ = false;
     bool notifying_ = false;

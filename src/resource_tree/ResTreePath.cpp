@@ -16,7 +16,7 @@ WString ResTreeNode::Path() const {
     WString path;
     for (auto it = chain.rbegin(); it != chain.rend(); ++it) {
         path.push_back(u'/');
-        path += EscapeListText((*it)->name_, u'/');
+        path += EscapeListText((*it)->Name(), u'/');
     }
     return path;
 }
