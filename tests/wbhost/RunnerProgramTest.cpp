@@ -207,7 +207,8 @@ TEST(RunnerUniqueName, AFreeNameIsKeptElseTheSmallestFreeNumberFollowsTheStem) {
     std::vector<std::u16string> taken{u"A"};
     for (int i = 1; i <= 200; ++i) {
         const std::string number = std::to_string(i);
-        taken.push_back(u"A" + std::u16string(number.begin(), number.end()));
+        taken.push_back(u"A");
+        taken.back().append(number.begin(), number.end());
     }
     EXPECT_EQ(UniqueName(u"A", taken), u"A201");
 }
