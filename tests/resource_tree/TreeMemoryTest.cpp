@@ -85,5 +85,21 @@ TEST(TreeMemory, NodesEditedForLongKeepTheirAnswersAndOrder) {
     EXPECT_EQ(*holder->TextAt(u"BETA"), u"2");
 }
 
+TEST(TreeMemory, NodeNamesAndTypesStayRightThroughRenames) {
+    ResTreeNode root(WString(), u"Target", false);
+    ResTreeNode* node = root.AddChild(root.End(), u"DIO0", u"IOResource", false).node;
+    ASSERT_NE(node, nullptr);
+    for (size_t i = 1; i <= 5000; ++i)
+        node->SetNameAndType(Numbered(u"DIO", i), node->Type());
+    EXPECT_EQ(node->Name(), u"DIO5000");
+    EXPECT_EQ(node->Type(), u"IOResource");
+    EXPECT_EQ(node->Path(), u"/DIO5000");
+    // Each one given as the other: both are read before either old spelling goes.
+    node->SetNameAndType(node->Type(), node->Name());
+    EXPECT_EQ(node->Name(), u"IOResource");
+    EXPECT_EQ(node->Type(), u"DIO5000");
+    EXPECT_EQ(root.Begin()->Name(), u"DIO0");
+}
+
 } // namespace
 } // namespace wbhw
