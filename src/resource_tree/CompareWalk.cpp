@@ -7,6 +7,7 @@
 #include <algorithm>
 #include <map>
 #include <unordered_set>
+#include <utility>
 #include <vector>
 
 namespace wbhw {
@@ -28,7 +29,7 @@ constexpr std::u16string_view kDeferredLoadPath = u":DeferredLoadPath";
 constexpr int kMaxDeferredRounds = 16;
 
 // A node with at least this many entries has its children walked with their memory asked for
-// ahead (ResTreeNode::PrefetchSubtree).
+// ahead (PrefetchChildren).
 constexpr size_t kLargeNode = 16;
 
 // What the rules make of a name (CompareWalk::ClassOf).
@@ -50,12 +51,19 @@ uint8_t ClassifyName(std::u16string_view name) {
 
 // The children of a large node are subtrees of a large tree, each most likely out of the cache,
 // and following the pointers through one waits for every line in turn. Asked for before the walk
-// reaches them, the memory of this pair of children and of the next arrives together.
-void PrefetchChildren(ResTreeNode::Position at, ResTreeNode::Position end) {
+// reaches them, the memory of this pair of children and of the next arrives together. (This pair
+// was mostly asked for a step earlier, as the next; but b's place may have moved on by more than
+// one entry since.) The children of a small node came in with the node.
+void PrefetchChildren(const ResTreeNode& a, ResTreeNode::Position e, const ResTreeNode& b,
+                      ResTreeNode::Position f) {
+    if (a.EntryCount() < kLargeNode || b.EntryCount() < kLargeNode)
+        return;
     constexpr int kAhead = 2;
-    for (int i = 0; i < kAhead && at != end; ++i, ++at) {
-        if (const ResTreeNode* child = at->Child())
-            child->PrefetchSubtree();
+    for (auto [at, end] : {std::pair(e, a.End()), std::pair(f, b.End())}) {
+        for (int i = 0; i < kAhead && at != end; ++i, ++at) {
+            if (const ResTreeNode* child = at->Child())
+                child->PrefetchSubtree();
+        }
     }
 }
 
@@ -242,12 +250,8 @@ uint32_t CompareWalk::Nodes(ResTreeNode* a, ResTreeNode* b) {
 uint32_t CompareWalk::SortedEntries(ResTreeNode& a, ResTreeNode& b, Tally& tally) {
     auto f = b.Begin();
     const auto bEnd = b.End();
-    const bool large = a.EntryCount() >= kLargeNode && b.EntryCount() >= kLargeNode;
     for (auto e = a.Begin(); e != a.End(); ++e) {
-        if (large) {
-            PrefetchChildren(e, a.End());
-            PrefetchChildren(f, bEnd);
-        }
+        PrefetchChildren(a, e, b, f);
         if (IsLocalized(*e))
             continue;
         // b's entries before E are passed over whether or not E takes part: an entry E would
@@ -283,12 +287,8 @@ uint32_t CompareWalk::SortedEntries(ResTreeNode& a, ResTreeNode& b, Tally& tally
 uint32_t CompareWalk::SequencedEntries(ResTreeNode& a, ResTreeNode& b, Tally& tally) {
     auto e = a.Begin();
     auto f = b.Begin();
-    const bool large = a.EntryCount() >= kLargeNode && b.EntryCount() >= kLargeNode;
     for (; e != a.End() && f != b.End() && SameSlot(*e, *f); ++e, ++f) {
-        if (large) {
-            PrefetchChildren(e, a.End());
-            PrefetchChildren(f, b.End());
-        }
+        PrefetchChildren(a, e, b, f);
         if (IsLocalized(*e) || SameText(*e, *f))
             continue;
         const uint8_t nameClass = ClassOf(e->Name());

@@ -61,8 +61,8 @@ ResTreePosition& ResTreePosition::operator++() noexcept {
     return *this;
 }
 
-ResTreeNode::ResTreeNode(WString name, WString type, bool ordered)
-    : ResTreeNode(std::u16string_view(name), std::u16string_view(type), ordered, nullptr) {}
+ResTreeNode::ResTreeNode(std::u16string_view name, std::u16string_view type, bool ordered)
+    : ResTreeNode(name, type, ordered, nullptr) {}
 
 ResTreeNode::ResTreeNode(std::u16string_view name, std::u16string_view type, bool ordered,
                          ResTreeNode* parent)
@@ -226,17 +226,18 @@ ResTreeNode::AddResult ResTreeNode::AddLink(Position position, std::u16string_vi
 }
 
 ResTreeNode::AddChildResult ResTreeNode::AddChild(Position position, std::u16string_view name,
-                                                  WString type, bool ordered) {
-    return MakeChild(position, name, std::move(type), ordered, false);
+                                                  std::u16string_view type, bool ordered) {
+    return MakeChild(position, name, type, ordered, false);
 }
 
 ResTreeNode::AddChildResult ResTreeNode::AddChildAt(Position position, std::u16string_view name,
-                                                    WString type, bool ordered) {
-    return MakeChild(position, name, std::move(type), ordered, true);
+                                                    std::u16string_view type, bool ordered) {
+    return MakeChild(position, name, type, ordered, true);
 }
 
 ResTreeNode::AddChildResult ResTreeNode::MakeChild(Position position, std::u16string_view name,
-                                                   WString&& type, bool ordered, bool hinted) {
+                                                   std::u16string_view type, bool ordered,
+                                                   bool hinted) {
     bool inserted = false;
     const Position at = InsertEntry(position, name, EntryKind::Child, inserted, hinted);
     if (!inserted)
@@ -246,7 +247,7 @@ ResTreeNode::AddChildResult ResTreeNode::MakeChild(Position position, std::u16st
     ArenaAllocator<ResTreeNode> arena(&memory_->arena);
     ResTreeNode* const child = arena.allocate(1);
     try {
-        std::construct_at(child, name, std::u16string_view(type), ordered, this);
+        std::construct_at(child, name, type, ordered, this);
     } catch (...) {
         arena.deallocate(child, 1);
         throw;

@@ -159,7 +159,7 @@ public:
     };
 
     // A root node; ORDERED chooses a sequence (true) or a name-sorted map (false) of entries.
-    ResTreeNode(WString name, WString type, bool ordered);
+    ResTreeNode(std::u16string_view name, std::u16string_view type, bool ordered);
     // A child node of PARENT (the caller's entry in PARENT owns it).
     ResTreeNode(std::u16string_view name, std::u16string_view type, bool ordered,
                 ResTreeNode* parent);
@@ -223,13 +223,13 @@ public:
     AddResult AddLink(Position position, std::u16string_view name, WString path);
     // Inserts a new child node, or (unordered) answers the existing entry of that name as is.
     // Raises ChildAdded when created.
-    AddChildResult AddChild(Position position, std::u16string_view name, WString type,
+    AddChildResult AddChild(Position position, std::u16string_view name, std::u16string_view type,
                             bool ordered);
     // AddChild, where a sorted node starts from POSITION (End() or an entry of this node) instead
     // of its root: with what Locate(NAME) answered, and no entry removed since, the insertion costs
     // two comparisons of names, not a second descent; another place only costs the descent. An
     // ordered node inserts before POSITION, as AddChild does.
-    AddChildResult AddChildAt(Position position, std::u16string_view name, WString type,
+    AddChildResult AddChildAt(Position position, std::u16string_view name, std::u16string_view type,
                               bool ordered);
     // Replaces the string of a text entry; false (and no change) for End and other kinds.
     bool SetTextAt(Position position, WString text);
@@ -335,7 +335,7 @@ private:
     // a sorted node looks for the place from POSITION when HINTED, else from its root.
     Position InsertEntry(Position position, std::u16string_view name, EntryKind kind,
                          bool& inserted, bool hinted = false);
-    AddChildResult MakeChild(Position position, std::u16string_view name, WString&& type,
+    AddChildResult MakeChild(Position position, std::u16string_view name, std::u16string_view type,
                              bool ordered, bool hinted);
     void EraseEntry(Position position) noexcept;
     // Raises the changes of a new value in the text entry ENTRY of this node.
